@@ -1,0 +1,44 @@
+# Set-up and test commands. Each installs the Debian packages it needs when
+# they are missing, configures and builds.
+
+PACKAGES := g++ cmake make libgtest-dev libsimdjson-dev yosys iverilog verilator
+JOBS ?= 2
+BUILD := build
+BUILD_ASAN := build-asan
+
+.PHONY: all deps build demo test test-unit bench clean format
+
+all: build
+
+deps:
+	@missing=""; for p in $(PACKAGES); do \
+	  dpkg-query -W -f='$${Status}\n' $$p 2>/dev/null | grep -q "install ok installed" || missing="$$missing $$p"; \
+	done; \
+	if [ -n "$$missing" ]; then \
+	  echo "Installing:$$missing"; \
+	  SUDO=""; [ "$$(id -u)" = 0 ] || SUDO=sudo; \
+	  $$SUDO apt-get update -qq && DEBIAN_FRONTEND=noninteractive $$SUDO apt-get install -y -qq --no-install-recommends $$missing >/dev/null; \
+	fi
+
+build: deps
+	cmake -S . -B $(BUILD) -DCMAKE_BUILD_TYPE=Release -DNLW_TESTS=OFF >/dev/null
+	cmake --build $(BUILD) -j$(JOBS)
+
+demo: build
+	@bash examples/demo.sh $(BUILD)
+
+# Unit tests and the end-to-end checks with real tools, built with
+# AddressSanitizer and UndefinedBehaviorSanitizer.
+test: deps
+	cmake -S . -B $(BUILD_ASAN) -DCMAKE_BUILD_TYPE=Debug -DNLW_SANITIZE=ON -DNLW_WERROR=$(if $(CI),ON,OFF) >/dev/null
+	cmake --build $(BUILD_ASAN) -j$(JOBS)
+	cd $(BUILD_ASAN) && ASAN_OPTIONS=detect_leaks=1 UBSAN_OPTIONS=print_stacktrace=1 ctest --output-on-failure -j$(JOBS)
+
+bench: build
+	@bash bench/run.sh $(BUILD)
+
+format:
+	clang-format -i host/*.h host/*.cpp s/*.h s/*.cpp apps/*.cpp apps/common/* tests/unit/*.cpp tests/unit/*/*.cpp 2>/dev/null || true
+
+clean:
+	rm -rf $(BUILD) $(BUILD_ASAN) out

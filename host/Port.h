@@ -1,0 +1,270 @@
+// Portability services: strings, files, streams, environment, installation
+// roots, messages and formatted text.
+#pragma once
+
+#include <cstdarg>
+#include <cstddef>
+#include <cstdint>
+#include <cstdio>
+#include <memory>
+#include <string>
+#include <vector>
+
+// printf-style formatting into a host buffer. The result stays valid until
+// eight further calls have been made, so a few results may be combined in one
+// expression (vorform("%s", vorform(...)) is safe). Never truncates.
+const char* vorform(const char* format, ...)
+#if defined(__GNUC__)
+    __attribute__((format(printf, 1, 2)))
+#endif
+    ;
+const char* vvorform(const char* format, va_list args);
+
+// Appends printf-style text to a std::string.
+void Port_AppendFormat(std::string& out, const char* format, ...)
+#if defined(__GNUC__)
+    __attribute__((format(printf, 2, 3)))
+#endif
+    ;
+
+namespace Port {
+
+// The host string: a value type used where names pass by value.
+template <typename C>
+class StringBase {
+public:
+    enum CompareKind { CaseSensitive = 0, IgnoreCase = 1 };
+
+    StringBase() = default;
+    StringBase(const C* text) : s_(text ? text : "") {}
+    StringBase(const std::basic_string<C>& text) : s_(text) {}
+    StringBase(const C* text, size_t len) : s_(text, len) {}
+
+    StringBase& operator=(const C* text) {
+        s_ = text ? text : "";
+        return *this;
+    }
+    StringBase& operator+=(const C* text) {
+        if (text) s_ += text;
+        return *this;
+    }
+    StringBase& operator+=(const StringBase& other) {
+        s_ += other.s_;
+        return *this;
+    }
+    StringBase& operator+=(C c) {
+        s_ += c;
+        return *this;
+    }
+    friend StringBase operator+(StringBase a, const StringBase& b) {
+        a += b;
+        return a;
+    }
+    bool operator==(const StringBase& o) const { return s_ == o.s_; }
+    bool operator!=(const StringBase& o) const { return s_ != o.s_; }
+    bool operator<(const StringBase& o) const { return s_ < o.s_; }
+
+    const C* c_str() const { return s_.c_str(); }
+    operator const C*() const { return s_.c_str(); }
+    size_t length() const { return s_.size(); }
+    size_t Length() const { return s_.size(); }
+    bool empty() const { return s_.empty(); }
+    C operator[](size_t i) const { return s_[i]; }
+    const std::basic_string<C>& str() const { return s_; }
+    std::basic_string<C>& str() { return s_; }
+
+    // 0 when equal; kind IgnoreCase compares ignoring ASCII case.
+    int Compare(const C* other, int kind = CaseSensitive) const;
+    void MakeUpper();
+    void MakeLower();
+    void SetChar(size_t pos, C c) {
+        if (pos < s_.size()) s_[pos] = c;
+    }
+    // The whole text read as an unsigned decimal number; 0 when it is not one.
+    uint32_t GetUINT32(bool* ok = nullptr) const;
+
+    // Splits text at any of the separator characters. With skipEmpty, empty
+    // pieces are dropped. A piece that begins with an open-quote character
+    // runs to the matching close-quote character, separators included; the
+    // quotes are removed.
+    static std::vector<StringBase> Split(const C* text, const C* separators, bool skipEmpty,
+                                         const C* openQuotes, const C* closeQuotes);
+
+private:
+    std::basic_string<C> s_;
+};
+
+using String = StringBase<char>;
+
+// An ordered list of directories.
+class PathList {
+public:
+    size_t size() const { return dirs_.size(); }
+    const char* operator[](size_t i) const { return dirs_[i].c_str(); }
+    void push_back(const std::string& d) { dirs_.push_back(d); }
+
+private:
+    std::vector<std::string> dirs_;
+};
+
+// The installation roots. VORNIX, when set, lists them separated by ':'
+// (an empty value gives an empty list). When it is unset the list is the
+// default installation: the share directory beside the running program
+// (../share relative to its directory) or, failing that, the share directory
+// of the source tree the program was built from.
+class VornixPath {
+public:
+    static const PathList& GetInstance();
+    // Forgets the cached list so that the next GetInstance reads VORNIX again.
+    static void Reset();
+};
+
+class Stream {
+public:
+    enum Access {
+        Read = 1,
+        Create = 2,   // a new file; an existing file is an error and is kept
+        Replace = 3,  // a new file or a replacement of an existing one
+        Memory = 4,   // no file: text is collected in memory (tests)
+    };
+
+    explicit Stream(int access = Read, size_t bufferSize = 4096);
+    ~Stream();
+    Stream(const Stream&) = delete;
+    Stream& operator=(const Stream&) = delete;
+
+    bool isOpen() const { return fp_ != nullptr; }
+    // Reads the next line without its line end into buffer (at most size-1
+    // characters; the rest of a longer line is returned by the next calls).
+    // Returns 0 at the end of the file.
+    int readline(char* buffer, int size);
+    // Reads the next whole line, whatever its length. Returns false at the end.
+    bool readline(std::string& line);
+    void close();
+
+private:
+    friend class File;
+    FILE* fp_ = nullptr;
+    std::vector<char> buf_;
+};
+
+class File {
+public:
+    static bool exist(const char* path);
+    static bool isdir(const char* path);
+    // Opens a text file for reading into stream. Returns false when it cannot.
+    static bool open(const char* path, Stream& stream, int flag = 0);
+    // Reads a whole file. Returns false (and sets error) when it cannot.
+    static bool readAll(const char* path, std::string& content, std::string* error = nullptr);
+};
+
+class FileName {
+public:
+    explicit FileName(const char* path) : path_(path ? path : "") {}
+    // The directory part including its final separator, or "".
+    const char* GetPath();
+    static const char* GetPathSeparator() { return "/"; }
+
+private:
+    std::string path_;
+    std::string dir_;
+};
+
+}  // namespace Port
+
+class Port_Env {
+public:
+    // The value, or null when the variable is not set.
+    static const char* GetEnv(const char* name);
+    // The path of a shipped data file: the first installation root holding
+    // data/<name>. Null when none does.
+    static const char* GetDataFileName(const char* name, int flag);
+    static bool IsNt() { return false; }
+};
+
+// Message levels, in the order of their severity.
+enum class Port_MsgLevel { Debug, Status, Info, Warning, Error, Internal };
+
+// One message as issued: level, domain and the formatted text.
+struct Port_Msg {
+    Port_MsgLevel level;
+    std::string domain;
+    std::string text;
+};
+
+// Receives every message the manager lets through.
+class Port_MsgSink {
+public:
+    virtual ~Port_MsgSink() = default;
+    virtual void Receive(const Port_Msg& msg) = 0;
+};
+
+// The process-wide message manager: counts messages per level and hands them
+// to its sinks (console, log file, test capture).
+class Port_MsgManager {
+public:
+    static Port_MsgManager& Instance();
+
+    void Issue(Port_MsgLevel level, const char* domain, const std::string& text);
+    int GetCount(Port_MsgLevel level) const { return counts_[static_cast<int>(level)]; }
+    void ResetCounts();
+
+    // Console presentation: status lines are dropped when quiet; debug lines
+    // are shown only when debug is on.
+    void SetQuiet(bool quiet) { quiet_ = quiet; }
+    void SetDebug(bool debug) { debug_ = debug; }
+    bool GetDebug() const { return debug_; }
+    void SetConsole(bool on) { console_ = on; }
+    // Copies every message to a log file. Returns false when it cannot be opened.
+    bool OpenLog(const char* path);
+    void CloseLog();
+
+    void AddSink(Port_MsgSink* sink);
+    void RemoveSink(Port_MsgSink* sink);
+
+private:
+    int counts_[6] = {0, 0, 0, 0, 0, 0};
+    bool quiet_ = false;
+    bool debug_ = false;
+    bool console_ = true;
+    FILE* log_ = nullptr;
+    std::vector<Port_MsgSink*> sinks_;
+};
+
+// Collects messages while it lives (tests).
+class Port_MsgCapture : public Port_MsgSink {
+public:
+    Port_MsgCapture();
+    ~Port_MsgCapture() override;
+    void Receive(const Port_Msg& msg) override { msgs.push_back(msg); }
+    // The texts of the messages of one level, in order.
+    std::vector<std::string> Texts(Port_MsgLevel level) const;
+    std::vector<Port_Msg> msgs;
+};
+
+// A message source: created for a domain, then issues printf-style messages.
+class Port_MsgManData {
+public:
+    static Port_MsgManData createObject(const char* domain, const char* source = "", int line = 0,
+                                        const char* revision = "");
+    void issueStatus(const char* format, ...);
+    void issueInfo(const char* format, ...);
+    void issueWarning(const char* format, ...);
+    void issueError(const char* format, ...);
+    void issueInternal(const char* format, ...);
+    // A trace on the debug channel.
+    static void debugStub(const char* format, ...);
+
+private:
+    explicit Port_MsgManData(const char* domain) : domain_(domain ? domain : "") {}
+    std::string domain_;
+};
+
+// Shorthand used by the writers: a message source of the writers' domain.
+#define NLW_MSG() Port_MsgManData::createObject("NetListWriters", __FILE__, __LINE__, "")
+
+class Port_MsgDispatcher {
+public:
+    // Ends the program with the exit code after flushing the message sinks.
+    [[noreturn]] static void exit(int code);
+};

@@ -1,0 +1,22 @@
+// Makes the names of a view legal Verilog before it is written.
+#pragma once
+
+#include "../host/Nlw_Nl_LU.h"
+
+class Nlw_Verilog;
+
+class Nlw_VerilogLU : public Nlw_Nl_LU {
+public:
+    // The host part gets (view, third, fourth, fifth, first); second is
+    // writeEscapedNames.
+    Nlw_VerilogLU(Nlw_Verilog* nlw, Nlw_NlView* view, bool first, bool second, bool third,
+                  bool fourth, bool fifth);
+    Nlw_VerilogLU(const Nlw_VerilogLU& other);
+    Nlw_VerilogLU& operator=(const Nlw_VerilogLU& other);
+
+    bool IsLegal(Port::String name, bool isBused) override;
+    Port::String Legalize(Port::String name, bool isBused) override;
+
+    bool writeEscapedNames = true;
+    Nlw_Verilog* nlw = nullptr;
+};
