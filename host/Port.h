@@ -144,8 +144,15 @@ public:
 
 private:
     friend class File;
+    // The next character of the file, or EOF; Peek does not consume it.
+    int Get();
+    int Peek();
+    bool Fill();
+
     FILE* fp_ = nullptr;
     std::vector<char> buf_;
+    size_t pos_ = 0;
+    size_t len_ = 0;
 };
 
 class File {
@@ -221,8 +228,13 @@ public:
 
     void AddSink(Port_MsgSink* sink);
     void RemoveSink(Port_MsgSink* sink);
+    // Flushes the console streams and the log file.
+    void Flush();
 
 private:
+    void ShowOnConsole(Port_MsgLevel level, const char* domain, const std::string& text);
+    void WriteToLog(Port_MsgLevel level, const char* domain, const std::string& text);
+
     int counts_[6] = {0, 0, 0, 0, 0, 0};
     bool quiet_ = false;
     bool debug_ = false;

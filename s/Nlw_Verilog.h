@@ -17,6 +17,9 @@ public:
     HelpFunction GetHelp() override;
     const char** GetReservedWords() override;
     unsigned char IsEscaped(const char* name) override;
+    // The results of Escape, GetRangeString and GetIndexesString live in one
+    // process-wide buffer per operation: a result stays valid until the same
+    // operation is called again.
     const char* Escape(const char* name, unsigned char isBused) override;
     const char* GetRangeString(Nlw_NlBus* bus) override;
     const char* GetIndexesString(DARRAY_Util_INT32* indexes) override;
@@ -28,10 +31,21 @@ public:
     static void Help();
     [[noreturn]] static void TesselHelp();
 
+    // The character rule of a simple Verilog identifier: letters and the
+    // underscore anywhere, digits and the dollar sign anywhere but first.
+    // Bytes above 127 are never part of one.
+    static bool IsSimpleIdentifierChar(unsigned char c, bool first) {
+        if ((c >= 'A' && c <= 'Z') || (c >= 'a' && c <= 'z') || c == '_') return true;
+        return !first && ((c >= '0' && c <= '9') || c == '$');
+    }
+
     static const char* const kQdb2verSynopsis;
     static const char* const kTesselSynopsis;
 
 private:
+    // Lets the unit tests reach the private drivers and header blocks.
+    friend struct Nlw_VerilogTestPeer;
+
     void WriteSdfFile();
     void WriteSdfMHFile();
     void WritePinFile();
@@ -48,5 +62,17 @@ private:
     void WriteEcnHeader(Nlw_Writer* writer);
     void WriteStaHeader(Nlw_Writer* writer);
     void WriteParams(Nlw_Writer* writer);
+    void WriteUseLib(Nlw_Writer* writer);
     bool IsChipwideNeeded();
+    void IssueChipwideNotice();
+
+    // Output file names, all derived from the netlist file name.
+    const char* GetOutputName() const;
+    std::string GetOutputRoot() const;
+    std::string GetOutputDirectory() const;
+    std::string GetRootFileName(const char* suffix) const;
+    std::string GetSdfFileName() const;
+    std::string GetSdfMHPrefix() const;
+    std::string GetAssertionFileName() const;
+    const char* GetDesignName() const;
 };

@@ -1,0 +1,110 @@
+#include "Nlw_App.h"
+
+#include <cstdio>
+#include <cstdlib>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "Nlw_JsonReader.h"
+#include "Nlw_Prep.h"
+#include "Nlw_Util.h"
+#include "Nlw_Verilog.h"
+#include "Port.h"
+
+namespace {
+
+const char* ProgramName(Nlw_Program program) {
+    return program == Nlw_Program::Qdb2ver ? "qdb2ver" : "tessel";
+}
+
+// The command as the file headers show it: words separated by blanks, a word
+// holding a blank in double quotes.
+std::string CommandText(Nlw_Program program, const std::vector<std::string>& args) {
+    std::string text = ProgramName(program);
+    for (const std::string& a : args) {
+        text += ' ';
+        if (a.find_first_of(" \t") != std::string::npos)
+            text += '"' + a + '"';
+        else
+            text += a;
+    }
+    return text;
+}
+
+int UsageError(Nlw_Program program, const std::string& problem) {
+    Port_MsgManData msg = Port_MsgManData::createObject(ProgramName(program));
+    msg.issueError("%s\n", problem.c_str());
+    std::fprintf(stderr, "Usage: %s\n",
+                 program == Nlw_Program::Qdb2ver ? Nlw_Verilog::kQdb2verSynopsis
+                                                 : Nlw_Verilog::kTesselSynopsis);
+    return 2;
+}
+
+// The input file as given, or with ".json" when it has no extension and
+// only that file exists.
+std::string ResolveInput(const std::string& name) {
+    if (Port::File::exist(name.c_str())) return name;
+    bool hasExtension = UT_PATH::GetRoot(name.c_str()) != name;
+    if (!hasExtension && Port::File::exist((name + ".json").c_str())) return name + ".json";
+    return name;
+}
+
+}  // namespace
+
+int Nlw_RunProgram(Nlw_Program program, int argc, const char* const* argv) {
+    std::vector<std::string> args;
+    for (int i = 1; i < argc; ++i) args.emplace_back(argv[i]);
+    Nlw_CommandLine cl = Nlw_ParseCommandLine(program, args);
+
+    if (cl.help) {
+        Nlw_Verilog help = program == Nlw_Program::Qdb2ver ? Nlw_Verilog() : Nlw_Verilog("tessel");
+        help.GetHelp()();
+        return 0;
+    }
+    if (!cl.error.empty()) return UsageError(program, cl.error);
+
+    Port_MsgManager& messages = Port_MsgManager::Instance();
+    messages.SetQuiet(cl.quiet);
+    messages.SetDebug(cl.debug);
+    Port_MsgManData msg = Port_MsgManData::createObject(ProgramName(program));
+    Nlw_Params& params = cl.params;
+    if (params.GetLogFileName() && !messages.OpenLog(params.GetLogFileName())) {
+        msg.issueError("Cannot open log file '%s'.\n", params.GetLogFileName());
+        return 2;
+    }
+    for (const std::string& option : cl.ignored)
+        msg.issueWarning(
+            "Option '%s' is accepted but has no effect: the design file holds no data for it.\n",
+            option.c_str());
+
+    params.SetCommandLine(CommandText(program, args).c_str());
+    const char* vornix = Port_Env::GetEnv("VORNIX");
+    const Port::PathList& roots = Port::VornixPath::GetInstance();
+    params.SetVornix(vornix ? vornix : roots.size() > 0 ? roots[0] : "");
+
+    std::string input = ResolveInput(params.GetInputFileName());
+    params.SetInputFileName(input.c_str());
+
+    Nlw_NlView view;
+    std::unique_ptr<Nlw_Design> design;
+    Nlw_ReadOptions readOptions;
+    readOptions.flatten = params.GetFlatten();
+    msg.issueStatus("Reading design file '%s' ...\n", input.c_str());
+    if (!Nlw_JsonReader::Load(input.c_str(), readOptions, view, design)) return 2;
+    if (params.GetTopModuleName() && view.GetRootMacro())
+        view.GetRootMacro()->GetType()->SetName(view.Intern(params.GetTopModuleName()));
+
+    Nlw_Verilog writer = program == Nlw_Program::Qdb2ver ? Nlw_Verilog() : Nlw_Verilog("tessel");
+    writer.SetParams(&params);
+    writer.SetView(&view);
+    writer.SetDesign(design.get());
+    std::unique_ptr<Ldm_TypeLib> typeLib(Nlw_Prep::LoadInstallationData(writer));
+    writer.SetTypeLib(typeLib.get());
+    Nlw_Prep::PrepareProperties(writer);
+    writer.WriteDesign();
+
+    int errors = messages.GetCount(Port_MsgLevel::Error) + messages.GetCount(Port_MsgLevel::Internal);
+    messages.CloseLog();
+    return errors > 0 ? 1 : 0;
+}

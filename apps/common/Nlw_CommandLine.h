@@ -1,0 +1,33 @@
+// The command lines of the two programs: options into run parameters.
+#pragma once
+
+#include <string>
+#include <vector>
+
+#include "Nlw_Params.h"
+
+enum class Nlw_Program { Qdb2ver, Tessel };
+
+// What the command line asked for besides the run parameters.
+struct Nlw_CommandLine {
+    Nlw_Params params;
+    bool help = false;         // -h: print the help text
+    std::string helpTopic;     // tessel -h <netlist_type>
+    bool debug = false;        // --debug or -verbose: debug traces on the console
+    bool quiet = false;        // -quiet, -intstyle silent
+    // Options accepted but without effect here, in the order given; each
+    // gets one warning naming it.
+    std::vector<std::string> ignored;
+    // Set when the command line is unusable; the program prints the synopsis.
+    std::string error;
+};
+
+// Parses args (without the program name). Never fails hard: problems are
+// reported in result.error.
+Nlw_CommandLine Nlw_ParseCommandLine(Nlw_Program program, const std::vector<std::string>& args);
+
+// The default output file: the input's root with ".v", or its base name
+// with ".v" in dir when one is given.
+std::string Nlw_DefaultOutputName(const std::string& input, const char* dir);
+// An output file name the user gave: ".v" is added unless it ends in it.
+std::string Nlw_GivenOutputName(const std::string& name);

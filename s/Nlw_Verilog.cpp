@@ -1,0 +1,247 @@
+// The writer object's life cycle, the design write flow and the output file
+// drivers.
+#include "Nlw_Verilog.h"
+
+#include <string>
+
+#include "../host/Nlw_Nl.h"
+#include "../host/Nlw_Nl_LU.h"
+#include "../host/Port.h"
+#include "../host/UT.h"
+#include "Nlw_VerilogLU.h"
+#include "Nlw_VerilogWriter.h"
+
+namespace {
+
+// Both constructors leave the process-wide bus settings in the same state:
+// one dimension per bus, names split by the host's lenient input style until
+// WriteDesign switches to the output style, and "[" "]" on output.
+void InitBusSettings() {
+    Nlw_NlBus::SetMultiDimensions(false);
+    Nlw_NlBus::SetInputDelimiterType(7);
+    Nlw_NlBus::SetOutputDelimiterType(4);
+}
+
+}  // namespace
+
+Nlw_Verilog::Nlw_Verilog() {
+    appName_ = "qdb2ver";
+    usage_ = kQdb2verSynopsis;
+    ext_ = "v";
+    InitBusSettings();
+}
+
+// The caller's application name is kept by pointer and must outlive the
+// object.
+Nlw_Verilog::Nlw_Verilog(const char* applicationName) {
+    appName_ = applicationName;
+    usage_ = kTesselSynopsis;
+    ext_ = "v";
+    InitBusSettings();
+}
+
+Nlw_Verilog::Nlw_Verilog(const Nlw_Verilog& other) : Nlw_NetlistWriter(other) {}
+
+Nlw_Verilog& Nlw_Verilog::operator=(const Nlw_Verilog& other) {
+    Nlw_NetlistWriter::operator=(other);
+    return *this;
+}
+
+Nlw_Verilog::~Nlw_Verilog() = default;
+
+void Nlw_Verilog::WriteDesign() {
+    Nlw_Params* params = GetParams();
+    Nlw_NlView* view = GetView();
+    if (params == nullptr || view == nullptr) {
+        NLW_MSG().issueInternal("No netlist view or parameters were given to the Verilog writer.\n");
+        return;
+    }
+
+    Nlw_NlBus::SetInputDelimiterType(4);
+
+    // The environment variables are tested for presence only: an empty value
+    // counts as set.
+    if (Port_Env::GetEnv("NLW_NO_NAMECACHE") == nullptr) {
+        Nlw_Nl_SpkCache::MakeSpkCache(GetReservedWords(), true);
+        const bool bridge = Port_Env::GetEnv("VOR_NLW_LU_NO_BRIDGEID") == nullptr;
+        Nlw_VerilogLU lu(this, view, bridge, params->GetWriteEscapedNames() != 0, true, true,
+                         false);
+        lu.Process();
+    }
+
+    if (Port_Env::GetEnv("NLW_WRITE_NLWFILE") != nullptr) WriteNlwFile();
+
+    if (params->GetWriteSdfFile() && UT_STR::_ICompare(params->GetInputFileType(), "qdb") != 0) {
+        if (params->GetMHFMode())
+            WriteSdfMHFile();
+        else
+            WriteSdfFile();
+    }
+    if (params->GetWritePinFile()) WritePinFile();
+    if (params->GetWriteTestFile()) WriteVerilogTestFile();
+    if (params->GetEcnMode()) WriteAssertionFile();
+
+    if (params->GetMHFMode()) {
+        WriteVerilogMHFile();
+        WriteChipwideFile();
+        if (params->GetWriteInstantiatedTimcells()) WriteISMFile();
+        WriteMHFInfoFile();
+    } else {
+        WriteVerilogFile();
+    }
+
+    if (params->GetStaMode()) WritePcsFile();
+    PrintInfoMessage();
+}
+
+// ---------------------------------------------------------------------------
+// File names
+
+const char* Nlw_Verilog::GetOutputName() const {
+    const char* name = GetParams()->GetOutputFileName();
+    return name ? name : "";
+}
+
+std::string Nlw_Verilog::GetOutputRoot() const { return UT_PATH::GetRoot(GetOutputName()); }
+
+std::string Nlw_Verilog::GetOutputDirectory() const {
+    Port::FileName fileName(GetOutputName());
+    const char* dir = fileName.GetPath();
+    return dir ? dir : "";
+}
+
+// "<root><suffix>" in the platform's form, such as "out/top.pin".
+std::string Nlw_Verilog::GetRootFileName(const char* suffix) const {
+    return UT_PATH::ExternalPath(vorform("%s%s", GetOutputRoot().c_str(), suffix));
+}
+
+const char* Nlw_Verilog::GetDesignName() const {
+    const Nlw_Design* design = GetDesign();
+    return design ? design->GetName() : "";
+}
+
+// ---------------------------------------------------------------------------
+// Drivers of the netlist files
+
+void Nlw_Verilog::WriteVerilogFile() {
+    const char* name = GetOutputName();
+    NLW_MSG().issueStatus("Writing Verilog netlist file '%s' ...\n", name);
+    Nlw_VerilogWriter writer(this, name, GetParams()->GetOutputFileMode());
+    writer.WriteView(GetView(), 0);
+}
+
+// One file per module type: the first block of a type met in the descending
+// walk writes it, later blocks of the same type (compared ignoring case)
+// write nothing.
+void Nlw_Verilog::WriteVerilogMHFile() {
+    NLW_MSG().issueStatus("Writing multiple Verilog netlists for design '%s' ...\n",
+                          GetDesignName());
+    const std::string directory = GetOutputDirectory();
+    const Port::Stream::Access mode = GetParams()->GetOutputFileMode();
+    UT_NCH_CACHE written(false);
+    const UT_DARRAY<Nlw_NlBlock*>& macros = GetView()->GetMacros();
+    for (size_t i = macros.GetCount(); i-- > 0;) {
+        Nlw_NlBlock* block = macros[i];
+        if (block == nullptr || !block->IsMacro()) continue;
+        const std::string fileName = directory + block->GetFileBaseName() + ".v";
+        Port::String typeName(block->GetTypeName());
+        typeName.MakeUpper();
+        UT_NCH_NAME* entry = written.add(typeName.c_str(), 1);
+        if (entry == nullptr || entry->GetCount() != 1) continue;
+        Port_MsgManData::debugStub("Writing Verilog netlist '%s' ...\n", fileName.c_str());
+        Nlw_VerilogWriter writer(this, fileName.c_str(), mode);
+        writer.WriteMHBlock(block);
+    }
+}
+
+void Nlw_Verilog::WriteChipwideFile() {
+    const std::string fileName = GetOutputDirectory() + "chipwide.v";
+    Port_MsgManData::debugStub("Writing chipwide.v...\n");
+    Nlw_VerilogWriter writer(this, fileName.c_str(), GetParams()->GetOutputFileMode());
+    writer.WriteChipwideModule();
+}
+
+void Nlw_Verilog::WriteISMFile() {
+    const std::string fileName = GetRootFileName("_ism.v");
+    NLW_MSG().issueStatus("Writing Verilog simulation model file '%s' ...\n", fileName.c_str());
+    Nlw_VerilogWriter writer(this, fileName.c_str(), GetParams()->GetOutputFileMode());
+    writer.WriteView(GetView(), 0);
+}
+
+// ---------------------------------------------------------------------------
+// Drivers whose writers are not part of this library yet. Each forms its file
+// name already; announcing and writing the file come with its writer.
+
+std::string Nlw_Verilog::GetSdfFileName() const {
+    const char* sdfPath = GetParams()->GetSdfPath();
+    if (sdfPath == nullptr) return GetRootFileName(".sdf");
+    const std::string base = UT_PATH::GetBase(UT_PATH::InternalPath(GetOutputName()).c_str());
+    return UT_PATH::ExternalPath(vorform("%s/%s.sdf", sdfPath, base.c_str()));
+}
+
+// The directory of the per-module timing files, with its final separator;
+// an empty timing directory means the working directory.
+std::string Nlw_Verilog::GetSdfMHPrefix() const {
+    const char* sdfPath = GetParams()->GetSdfPath();
+    if (sdfPath == nullptr) return GetOutputDirectory();
+    std::string prefix = sdfPath;
+    if (!prefix.empty())
+        prefix += std::string(Port::FileName::GetPathSeparator()) == "/" ? "/" : "\\";
+    return prefix;
+}
+
+std::string Nlw_Verilog::GetAssertionFileName() const {
+    const bool formality = UT_STR::ICompare(GetParams()->GetEcnTool(), "formality") == 0;
+    return GetRootFileName(formality ? ".svf" : ".vxc");
+}
+
+void Nlw_Verilog::WriteSdfFile() {
+    const std::string fileName = GetSdfFileName();
+    // The timing file writer comes later.
+    (void)fileName;
+}
+
+// One timing file per module block, not grouped by type.
+void Nlw_Verilog::WriteSdfMHFile() {
+    const std::string prefix = GetSdfMHPrefix();
+    const UT_DARRAY<Nlw_NlBlock*>& macros = GetView()->GetMacros();
+    for (size_t i = macros.GetCount(); i-- > 0;) {
+        Nlw_NlBlock* block = macros[i];
+        if (block == nullptr || !block->IsMacro()) continue;
+        const std::string fileName = prefix + block->GetFileBaseName() + ".sdf";
+        // The timing file writer comes later.
+        (void)fileName;
+    }
+}
+
+void Nlw_Verilog::WritePinFile() {
+    const std::string fileName = GetRootFileName(".pin");
+    // The pin map writer comes later.
+    (void)fileName;
+}
+
+void Nlw_Verilog::WriteVerilogTestFile() {
+    const std::string fileName = GetRootFileName(".tv");
+    // The test fixture writer comes later.
+    (void)fileName;
+}
+
+void Nlw_Verilog::WriteAssertionFile() {
+    // Without a design map file there is nothing to assert.
+    if (GetParams()->GetQdmFileName() == nullptr) return;
+    const std::string fileName = GetAssertionFileName();
+    // The assertion writer comes later.
+    (void)fileName;
+}
+
+void Nlw_Verilog::WriteMHFInfoFile() {
+    const std::string fileName = GetRootFileName("_mhf_info.txt");
+    // The hierarchy information writer comes later.
+    (void)fileName;
+}
+
+void Nlw_Verilog::WritePcsFile() {
+    const std::string fileName = GetRootFileName(".pcs");
+    // The translation file writer comes later.
+    (void)fileName;
+}

@@ -1,0 +1,129 @@
+#include <gtest/gtest.h>
+
+#include <string>
+#include <vector>
+
+#include "Nlw_CommandLine.h"
+
+namespace {
+
+Nlw_CommandLine Parse(Nlw_Program p, std::vector<std::string> args) {
+    return Nlw_ParseCommandLine(p, args);
+}
+
+TEST(CommandLine, Qdb2verSwitchesReachTheParameters) {
+    Nlw_CommandLine cl = Parse(Nlw_Program::Qdb2ver,
+                               {"-10ps", "-aka", "-cd", "-fn", "-ism", "-ne", "-pf", "-tf", "-ul",
+                                "-w", "-shm", "in.json"});
+    ASSERT_EQ(cl.error, "");
+    const Nlw_Params& p = cl.params;
+    EXPECT_FALSE(p.GetWritePsTimePrecision());
+    EXPECT_TRUE(p.GetWriteAka());
+    EXPECT_TRUE(p.GetWriteCellDefine());
+    EXPECT_TRUE(p.GetFlatten());
+    EXPECT_TRUE(p.GetWriteInstantiatedTimcells());
+    EXPECT_FALSE(p.GetWriteEscapedNames());
+    EXPECT_TRUE(p.GetWritePinFile());
+    EXPECT_TRUE(p.GetWriteTestFile());
+    EXPECT_TRUE(p.GetWriteUseLib());
+    EXPECT_TRUE(p.GetWriteShm());
+    EXPECT_EQ(p.GetOutputFileMode(), Port::Stream::Replace);
+    EXPECT_STREQ(p.GetInputFileName(), "in.json");
+    EXPECT_STREQ(p.GetInputFileType(), "json");
+    EXPECT_STREQ(p.GetOutputFileName(), "in.v");
+}
+
+TEST(CommandLine, DefaultsWithoutOptions) {
+    Nlw_CommandLine cl = Parse(Nlw_Program::Qdb2ver, {"dir.x/design.qda"});
+    ASSERT_EQ(cl.error, "");
+    const Nlw_Params& p = cl.params;
+    EXPECT_TRUE(p.GetSimMode());
+    EXPECT_TRUE(p.GetWritePsTimePrecision());
+    EXPECT_TRUE(p.GetWriteEscapedNames());
+    EXPECT_TRUE(p.GetInsert_chipwide());
+    EXPECT_EQ(p.GetOutputFileMode(), Port::Stream::Create);
+    EXPECT_STREQ(p.GetInputFileType(), "qda");
+    EXPECT_STREQ(p.GetOutputFileName(), "dir.x/design.v");
+    EXPECT_EQ(p.GetSdfPath(), nullptr);
+}
+
+TEST(CommandLine, OutputNameGetsVerilogExtension) {
+    EXPECT_STREQ(Parse(Nlw_Program::Qdb2ver, {"a.json", "out/net"}).params.GetOutputFileName(),
+                 "out/net.v");
+    EXPECT_STREQ(Parse(Nlw_Program::Qdb2ver, {"a.json", "net.v"}).params.GetOutputFileName(),
+                 "net.v");
+    EXPECT_STREQ(Parse(Nlw_Program::Tessel, {"-dir", "o", "x/a.json"}).params.GetOutputFileName(),
+                 "o/a.v");
+}
+
+TEST(CommandLine, ValuesAndOptionalValues) {
+    Nlw_CommandLine cl = Parse(Nlw_Program::Qdb2ver, {"-ti", "u0", "-tm", "chip", "-log", "l.txt",
+                                                      "-sdf_path", "sdf", "-insert_chipwide",
+                                                      "FALSE", "a.json"});
+    ASSERT_EQ(cl.error, "");
+    EXPECT_STREQ(cl.params.GetRootInstanceName(), "u0");
+    EXPECT_STREQ(cl.params.GetTopModuleName(), "chip");
+    EXPECT_STREQ(cl.params.GetLogFileName(), "l.txt");
+    EXPECT_STREQ(cl.params.GetSdfPath(), "sdf");
+    EXPECT_FALSE(cl.params.GetInsert_chipwide());
+    // Without a following file name the word after -sdf_path is the input.
+    Nlw_CommandLine bare = Parse(Nlw_Program::Qdb2ver, {"-sdf_path", "a.json"});
+    ASSERT_EQ(bare.error, "");
+    EXPECT_EQ(bare.params.GetSdfPath(), nullptr);
+    EXPECT_STREQ(bare.params.GetInputFileName(), "a.json");
+}
+
+TEST(CommandLine, TesselModesAndFiles) {
+    Nlw_CommandLine cl = Parse(Nlw_Program::Tessel, {"-sta", "-mhf", "-tb", "-vcd", "-ofmt",
+                                                     "verilog", "-intstyle", "silent", "a.json"});
+    ASSERT_EQ(cl.error, "");
+    EXPECT_TRUE(cl.params.GetStaMode());
+    EXPECT_FALSE(cl.params.GetSimMode());
+    EXPECT_TRUE(cl.params.GetMHFMode());
+    EXPECT_TRUE(cl.params.GetWriteTestFile());
+    EXPECT_TRUE(cl.params.GetWriteVcd());
+    EXPECT_TRUE(cl.quiet);
+    Nlw_CommandLine ecn = Parse(Nlw_Program::Tessel, {"-ecn", "formality", "-qdm", "d.qdm", "a"});
+    ASSERT_EQ(ecn.error, "");
+    EXPECT_TRUE(ecn.params.GetEcnMode());
+    EXPECT_STREQ(ecn.params.GetEcnTool(), "formality");
+    EXPECT_STREQ(ecn.params.GetQdmFileName(), "d.qdm");
+}
+
+TEST(CommandLine, OptionsWithoutDataAreAcceptedAndListed) {
+    Nlw_CommandLine cl =
+        Parse(Nlw_Program::Tessel, {"-gp", "GSR", "-s", "5", "-qcf", "c.qcf", "--cleanup", "a.json"});
+    ASSERT_EQ(cl.error, "");
+    EXPECT_EQ(cl.ignored, (std::vector<std::string>{"-gp", "-s", "-qcf", "--cleanup"}));
+}
+
+TEST(CommandLine, UnusableCommandLines) {
+    struct Case {
+        Nlw_Program program;
+        std::vector<std::string> args;
+    };
+    const Case cases[] = {
+        {Nlw_Program::Qdb2ver, {}},                              // no input file
+        {Nlw_Program::Qdb2ver, {"-bogus", "a.json"}},            // unknown option
+        {Nlw_Program::Qdb2ver, {"a.json", "-ti"}},               // missing value
+        {Nlw_Program::Qdb2ver, {"-insert_chipwide", "maybe", "a"}},  // bad value
+        {Nlw_Program::Qdb2ver, {"-sim", "a.json"}},              // a tessel option
+        {Nlw_Program::Tessel, {"-ofmt", "vhdl", "a.json"}},
+        {Nlw_Program::Tessel, {"-intstyle", "loud", "a.json"}},
+        {Nlw_Program::Tessel, {"a.json", "b.v", "c"}},           // one word too many
+    };
+    for (const Case& c : cases) {
+        Nlw_CommandLine cl = Parse(c.program, c.args);
+        EXPECT_NE(cl.error, "") << ::testing::PrintToString(c.args);
+    }
+}
+
+TEST(CommandLine, HelpWithAndWithoutTopic) {
+    EXPECT_TRUE(Parse(Nlw_Program::Qdb2ver, {"-h"}).help);
+    Nlw_CommandLine t = Parse(Nlw_Program::Tessel, {"-h", "sim"});
+    EXPECT_TRUE(t.help);
+    EXPECT_EQ(t.helpTopic, "sim");
+    EXPECT_EQ(t.error, "");
+}
+
+}  // namespace
