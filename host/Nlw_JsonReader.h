@@ -26,4 +26,13 @@ public:
     static bool LoadText(const std::string& text, const char* fileName,
                          const Nlw_ReadOptions& options, Nlw_NlView& view,
                          std::unique_ptr<Nlw_Design>& design);
+
+    // A block made for a cell carries the cell's parameters as its first
+    // properties, in file order. When attributes the writers read follow
+    // them ("PINNAME", "TYPE"), the block also carries the integer property
+    // "NLW_PARAM_COUNT" with the number of parameters. Gives how many of the
+    // block's first properties are parameters: that count, or else those
+    // before the first property whose name begins with "NLW_" (later passes
+    // add only such names).
+    static size_t GetParameterCount(const Vdm_PropertyHolder& block);
 };

@@ -61,6 +61,8 @@ public:
     virtual const char* GetIndexesString(DARRAY_Util_INT32* indexes) = 0;
     virtual void WriteDesign() = 0;
     virtual void WriteHeader(Nlw_Writer* writer) = 0;
+    // Defaults: every name is legal and stays as it is; every block is
+    // definable; PrepPin and PrepNetwork do nothing.
     virtual unsigned char IsDefinable(Nlw_NlBlock* block);
     // True for every block except those marked "NLW_NOT_INSTANTIATABLE".
     virtual unsigned char IsInstantiatable(Nlw_NlBlock* block);
@@ -78,8 +80,11 @@ public:
     void SetDesign(Nlw_Design* d) { design_ = d; }
     Ldm_TypeLib* GetTypeLib() const { return typeLib_; }
     void SetTypeLib(Ldm_TypeLib* t) { typeLib_ = t; }
-    // The device data of the run's part ("device.key" of the installation).
+    // The device data of the run's part ("device.key" of the installation),
+    // made on first use.
     PM_DEVKEY* GetDevkey();
+    // The view's part (an empty part when there is no view or part), made on
+    // first use.
     PM_PIC* GetPmPic();
     const char* GetApplicationName() const { return appName_; }
     const char* GetApplicationVersion() const;
@@ -89,18 +94,25 @@ public:
     void SetIsVornixCore(bool v) { isVornixCore_ = v; }
     std::vector<AnnoVacuum>& GetAnnoVacuums() { return annoVacuums_; }
 
-    // Writes the host's own dump of the netlist to "<output root>.nlw".
+    // Writes the host's own dump of the netlist to "<output root>.nlw",
+    // replacing an older dump.
     void WriteNlwFile();
-    // Brings text to exactly count characters: pads with fill on the left
-    // (a value's leading digits) or cuts from the left, keeping the least
-    // significant digits.
+    // Brings text to exactly count characters: pads on the left with the
+    // first character of fill ("0" when fill is empty), or cuts from the
+    // left, keeping the count rightmost (least significant) characters.
     void PadOrTrim(size_t count, Port::String& text, const char* fill);
 
-    // The simulatable property table, filled by the host (LoadSimPropTable).
+    // The simulatable property table: per block type (any case), the
+    // parameter definitions in the order they were added. The writer owns
+    // the lists it made itself (LoadSimPropTable, AddSimProperty).
     Nlw_SimPropTable simPropTable;
-    // Fills the table from the installation's data file; returns false and
-    // reports an error when the file is present but malformed.
+    // Adds the definitions of a table file (lines "CELLTYPE PARAM TYPE
+    // DEFAULT", '#' comments). Returns false when the file does not exist
+    // (silently), cannot be read or holds a malformed line (one error naming
+    // the file and line; the table is then left as it was).
     bool LoadSimPropTable(const char* path);
+    // Appends one definition for a block type.
+    void AddSimProperty(const char* cellType, const char* name, const char* type, const char* dflt);
 
 protected:
     const char* appName_ = "";
@@ -117,4 +129,8 @@ private:
     bool isVornixCore_ = false;
     std::vector<AnnoVacuum> annoVacuums_;
     std::vector<std::unique_ptr<std::vector<Nlw_Property>>> simPropStorage_;
+
+    // The definition list of a block type, made (and owned) when new.
+    std::vector<Nlw_Property>* SimPropList(const char* cellType);
+    void CopySimPropTable(const Nlw_NetlistWriter& other);
 };

@@ -27,9 +27,15 @@ class Nlw_NlType;
 class Nlw_NlNetwork;
 class Nlw_NlBuilder;
 struct Nlw_NlArena;
+struct Nlw_NlNameIndex;
 
 // Direction codes.
-enum Nlw_Direction { NLW_DIR_UNTYPED = 0, NLW_DIR_INPUT = 1, NLW_DIR_OUTPUT = 2, NLW_DIR_INOUT = 3 };
+enum Nlw_Direction {
+    NLW_DIR_UNTYPED = 0,
+    NLW_DIR_INPUT = 1,
+    NLW_DIR_OUTPUT = 2,
+    NLW_DIR_INOUT = 3
+};
 
 // Pin types: the pad pin of a pad cell is type 7.
 enum { NLW_PINTYPE_PLAIN = 0, NLW_PINTYPE_PAD = 7 };
@@ -48,15 +54,21 @@ public:
     static bool GetMultiDimensions();
     // Delimiter styles: 4 is "[" "]"; 7 (the input style of the programs
     // before writing) accepts "[" "]", "<" ">" and "(" ")" when splitting.
+    // Defaults: input 7, output 4, multi-dimensions off.
     static void SetInputDelimiterType(int type);
     static int GetInputDelimiterType();
     static void SetOutputDelimiterType(int type);
     static int GetOutputDelimiterType();
+    // The characters written for a style: "[" and "]" for every style (7
+    // only differs when names are split).
     static char GetLeftDelimiter(int type);
     static char GetRightDelimiter(int type);
     // True when name ends in one bus index in the input delimiter style, such
-    // as "d[3]" or "\a b [3]"; base then holds the name without the index and
-    // indexes holds the index (cleared first).
+    // as "d[3]", "d[-1]" or "\a b [3]"; base then holds the name without the
+    // index ("\a b ") and indexes holds the index (cleared first). A name
+    // that is nothing but an index, or whose index does not fit 32 bits, is
+    // not a bus name. With multi-dimensions on, every trailing index is
+    // taken ("m[1][2]" gives m, 1, 2).
     static bool IsBusName(const char* name, std::string& base, DARRAY_Util_INT32* indexes);
 
     const char* GetWritableName() const { return name_; }
@@ -81,7 +93,8 @@ public:
     bool IsPinBus() const { return isPinBus_; }
     Nlw_NlBlock* GetBlock() const { return owner_; }
     // Member by bus index (a pin for a pin bus, a signal for a signal bus);
-    // null when out of range or not present.
+    // null when out of range or not present. A library cell type's bus has
+    // its members on each instance: use the block's GetPinByAlias.
     Nlw_NlPin* GetPinMember(int32_t index) const;
     Nlw_NlSignal* GetSignalMember(int32_t index) const;
     std::string ToString() const;
@@ -92,6 +105,8 @@ public:
 
 protected:
     friend class Nlw_NlBuilder;
+    friend class Nlw_NlBlock;
+    friend class Nlw_Nl_LU;
     Nlw_NlBus() = default;
     const char* name_ = "";
     const char* aka_ = nullptr;
@@ -102,13 +117,18 @@ protected:
     uint8_t order_ = 0;
     bool valid_ = true;
     bool isPinBus_ = false;
-    // Members by offset from min(msb, lsb): pins, or signals.
+    // A signal bus's members by offset from min(msb, lsb), created on
+    // demand (null until then).
     void** members_ = nullptr;
-    // For a bus of a library cell type, members are found through the
-    // instance: the position of the member of index min(msb,lsb) in the
-    // instance's pin array, and the step of the position per index.
+    // A pin bus's members are found by position in the pin array of the
+    // block (the instance, for a bus of a library cell type): the position of
+    // the member of index min(msb, lsb), and the step of the position per
+    // index. Positions survive the growth of a macro's pin array.
     int32_t firstPinPos_ = -1;
     int32_t posStep_ = 1;
+    // The library cell type a type-level pin bus belongs to (owner_ is then
+    // null).
+    Nlw_NlType* type_ = nullptr;
 };
 
 class Nlw_NlPinBus : public Nlw_NlBus {
@@ -154,6 +174,7 @@ public:
 private:
     friend class Nlw_NlBuilder;
     friend class Nlw_NlSignal;
+    friend class Nlw_Nl_LU;
     Nlw_NlPin() = default;
     const char* name_ = "";
     const char* aka_ = nullptr;
@@ -201,8 +222,9 @@ public:
     PinRange GetPins() const { return {PinIter(this, firstPin_), PinIter(this, nullptr)}; }
     size_t GetPinCount() const;
 
-    // The driving pin: an output of a child block, or an input port of the
-    // enclosing block seen from inside; null when nothing drives the signal.
+    // The driving pin: the first output of a child block or input port of
+    // the enclosing block seen from inside; failing both, the first
+    // bidirectional pin of either kind; null when nothing drives the signal.
     Nlw_NlPin* FindDriverPin() const;
     Nlw_NlPin* FindDriver(bool, bool) const { return FindDriverPin(); }
     // The pin the host's global signal object refers to, or null.
@@ -215,6 +237,10 @@ private:
     friend class Nlw_NlBuilder;
     friend class Nlw_NlPin;
     Nlw_NlSignal() = default;
+    // The next pin after p on this signal's list.
+    Nlw_NlPin* NextPin(const Nlw_NlPin* p) const {
+        return p->signal_ == this ? p->nextOnSignal_ : p->nextOnChild_;
+    }
     const char* name_ = "";
     const char* aka_ = nullptr;
     const char* model_ = "";
@@ -224,13 +250,16 @@ private:
     Nlw_NlPin* lastPin_ = nullptr;
     Nlw_NlNetwork* network_ = nullptr;
     Nlw_NlPin* refPin_ = nullptr;
-    Nlw_NlArena* arena_ = nullptr;
     bool visible_ = true;
 };
 
 // A cell or module type, shared by its instances.
 class Nlw_NlType {
 public:
+    ~Nlw_NlType();
+    Nlw_NlType(const Nlw_NlType&) = delete;
+    Nlw_NlType& operator=(const Nlw_NlType&) = delete;
+
     const char* GetName() const { return name_; }
     const char* GetAka() const { return aka_; }
     bool IsModule() const { return isModule_; }
@@ -254,16 +283,28 @@ public:
 
 private:
     friend class Nlw_NlBuilder;
+    friend class Nlw_Nl_LU;
+    friend class Nlw_NlBlock;
+    friend class Nlw_NlBus;
+    friend class Nlw_NlPin;
+    friend class Nlw_NlView;
     Nlw_NlType() = default;
     const char* name_ = "";
     const char* aka_ = nullptr;
-    Nlw_NlArena* arena_ = nullptr;
+    Nlw_NlView* view_ = nullptr;
     bool isModule_ = false;
     bool timcell_ = false;
     bool funcell_ = false;
+    // Set once an instance exists: the pin definitions are then fixed.
+    bool instantiated_ = false;
+    // Set when a pin of one instance was renamed on its own; lookups by name
+    // then check the instance's pins instead of trusting the definitions.
+    bool pinsDiverge_ = false;
     int primType_ = 0;
     std::vector<PinDef> pinDefs_;
     std::vector<Nlw_NlPinBus*> pinBuses_;
+    UT_DARRAY<Nlw_NlPinBus*> pinBusArray_;  // the same buses, as blocks give them
+    std::unique_ptr<Nlw_NlNameIndex> index_;
 };
 
 class Nlw_NlBlock : public Vdm_PropertyHolder {
@@ -294,8 +335,9 @@ public:
     };
     // Pins are stored contiguously: iterate with for (Nlw_NlPin& p : GetPins()).
     PinRange GetPins() const { return {pins_, pins_ + numPins_}; }
-    // The pin whose name is the alias: a scalar pin's name, or a bus name
-    // followed by an index, such as "D[3]". Null when there is none.
+    // The pin whose name is the alias: a bus name followed by an index in
+    // the output style, such as "D[3]" (the bus's member of that index), or
+    // else a pin's own name. Null when there is none.
     Nlw_NlPin* GetPinByAlias(const char* alias) const;
     // The first pin of that writable name, or null.
     Nlw_NlPin* FindPin(const char* name) const;
@@ -310,6 +352,7 @@ public:
     // The external property list gathered by the preparation pass (a list
     // property of Verilog-ready parameter texts), or null.
     Vdm_Property* GetExternalProperties() const { return extProps_; }
+    // The block takes ownership of the list and deletes a list it had.
     void SetExternalProperties(Vdm_Property* list);
 
     // "type instance" for messages.
@@ -323,7 +366,13 @@ public:
 private:
     friend class Nlw_NlBuilder;
     friend class Nlw_NlView;
+    friend class Nlw_NlPin;
+    friend class Nlw_NlBus;
     Nlw_NlBlock() = default;
+    // The pin bus of that writable name (first of that name), or null.
+    Nlw_NlPinBus* FindPinBus(const char* name, size_t len) const;
+    // The pin of a bus member by bus index, or null.
+    Nlw_NlPin* GetBusMember(const Nlw_NlPinBus* bus, int32_t index) const;
     Nlw_NlType* type_ = nullptr;
     const char* name_ = "";
     const char* aka_ = nullptr;
@@ -332,7 +381,7 @@ private:
     Nlw_NlPin* pins_ = nullptr;
     uint32_t numPins_ = 0;
     MacroData* macro_ = nullptr;
-    Vdm_Property* extProps_ = nullptr;
+    Vdm_Property* extProps_ = nullptr;  // owned
 };
 
 // The design: its name.
@@ -353,7 +402,8 @@ public:
     Nlw_NlView& operator=(const Nlw_NlView&) = delete;
 
     Nlw_NlBlock* GetRootMacro() const { return root_; }
-    // Macro blocks: the root first, then every module instance depth-first.
+    // Macro blocks: the root first, then every module instance in the order
+    // the builder created them (depth-first, as the reader creates them).
     size_t GetNumMacros() const { return macros_.GetCount(); }
     const UT_DARRAY<Nlw_NlBlock*>& GetMacros() const { return macros_; }
     // The global set/reset and tristate signals, or null.
@@ -365,16 +415,22 @@ public:
     const std::vector<Nlw_NlType*>& GetTypes() const { return types_; }
     Nlw_NlType* FindType(const char* name) const;
     size_t GetNumLeafBlocks() const { return numLeaves_; }
-    // Interns a text for the view's lifetime.
+    // Copies a text into the view's storage; the copy lives as long as the
+    // view. Null gives "".
     const char* Intern(const char* text);
     const char* Intern(const char* text, size_t len);
 
 private:
     friend class Nlw_NlBuilder;
+    friend class Nlw_NlType;
+    struct TypeIndex;
+    void DestroyBlock(Nlw_NlBlock* block);
     std::unique_ptr<Nlw_NlArena> arena_;
+    std::unique_ptr<TypeIndex> typeIndex_;
     Nlw_NlBlock* root_ = nullptr;
     UT_DARRAY<Nlw_NlBlock*> macros_;
-    std::vector<Nlw_NlType*> types_;
+    std::vector<Nlw_NlType*> types_;  // owned
+    std::vector<Nlw_NlNetwork*> networks_;
     Nlw_NlSignal* setReset_ = nullptr;
     Nlw_NlSignal* tristate_ = nullptr;
     std::string device_;

@@ -1,6 +1,11 @@
 // The one way to create model objects; used by the design reader and tests.
 #pragma once
 
+#include <memory>
+#include <string_view>
+#include <unordered_map>
+#include <vector>
+
 #include "Nlw_Nl.h"
 
 class Nlw_NlBuilder {
@@ -30,7 +35,8 @@ public:
                              int32_t lsb);
     // Fixes the number of ports a macro will get so that its pins can be
     // stored contiguously; optional, AddPort grows as needed before the
-    // first connection.
+    // first connection. Growing moves the pins: pin pointers taken before
+    // are only valid when the ports were reserved.
     void ReservePorts(Nlw_NlBlock* macro, size_t count);
 
     // Signals inside a macro block. A signal bus's members "name[i]" are
@@ -39,15 +45,22 @@ public:
     Nlw_NlBus* AddSignalBus(Nlw_NlBlock* macro, const char* name, int32_t msb, int32_t lsb);
     Nlw_NlSignal* GetSignalBusMember(Nlw_NlBus* bus, int32_t index);
 
-    // Connections.
+    // Connections. Connect joins a pin of a child block to a signal of the
+    // block's parent; ConnectChild joins a macro's port to a signal inside
+    // the macro. Both append the pin to the signal's pin list; connecting a
+    // pin again moves it to the new signal. A signal of the wrong block is
+    // refused with an internal message.
     void Connect(Nlw_NlPin* pin, Nlw_NlSignal* outside);
     void ConnectChild(Nlw_NlPin* port, Nlw_NlSignal* inside);
+    // Adds the integer property "TIEOFF".
     void SetTieOff(Nlw_NlPin* pin, int value);
 
     void SetVisible(Nlw_NlPin* pin, bool visible);
     void SetVisible(Nlw_NlSignal* signal, bool visible);
     void SetValid(Nlw_NlBus* bus, bool valid);
     void SetPinType(Nlw_NlPin* pin, int pinType);
+    // The network of the signal's hierarchical net: every signal joined to
+    // it through ports, up and down the hierarchy, shares it.
     Nlw_NlNetwork* GetOrCreateNetwork(Nlw_NlSignal* signal);
     void SetRefPin(Nlw_NlSignal* signal, Nlw_NlPin* pin);
     void SetSetReset(Nlw_NlSignal* signal);
@@ -55,5 +68,61 @@ public:
     void SetDevice(const char* device, const char* part);
 
 private:
+    Nlw_NlBus* NewBus(const char* name, int32_t msb, int32_t lsb, bool pinBus);
+    Nlw_NlBlock* NewBlock(Nlw_NlBlock* parent, Nlw_NlType* type, const char* instanceName,
+                          bool macro);
+    Nlw_NlPin* AppendPort(Nlw_NlBlock* macro, const char* name, int dir);
+    void GrowPins(Nlw_NlBlock* macro, size_t capacity);
+    Nlw_NlSignal* NewSignal(Nlw_NlBlock* macro, const char* name, size_t len);
+    // Signal pin lists: the link from p to the next pin on s.
+    static Nlw_NlPin*& LinkOf(Nlw_NlPin* p, const Nlw_NlSignal* s);
+    static void Append(Nlw_NlSignal* s, Nlw_NlPin* p);
+    static void Unlink(Nlw_NlSignal* s, Nlw_NlPin* p);
     Nlw_NlView* view_;
+};
+
+// Storage and indexes behind the model. Only the model's own sources use
+// these.
+
+// A chunked bump allocator: objects, pin arrays and name texts of one view.
+// Memory is released with the view; destructors are run by the view.
+struct Nlw_NlArena {
+    void* Allocate(size_t size, size_t align);
+    const char* Copy(const char* text, size_t len);
+    size_t GetBytes() const { return bytes_; }
+
+private:
+    static constexpr size_t kChunk = size_t(1) << 20;
+    std::vector<std::unique_ptr<char[]>> chunks_;
+    char* cur_ = nullptr;
+    size_t left_ = 0;
+    size_t bytes_ = 0;
+};
+
+// Name lookups of a block or a library cell type: pin position and pin bus
+// by writable name, built on first use and rebuilt after a rename. Small
+// blocks are searched directly and never build it.
+struct Nlw_NlNameIndex {
+    // Up to this many pins or buses a direct search is cheaper.
+    static constexpr size_t kDirect = 8;
+    std::unordered_map<std::string_view, uint32_t> pins;
+    std::unordered_map<std::string_view, Nlw_NlPinBus*> buses;
+    bool pinsBuilt = false;
+    bool busesBuilt = false;
+};
+
+// Parses the index that ends name[0, end): a left delimiter, an optionally
+// negative decimal number that fits 32 bits, a right delimiter ending at
+// end ("[" "]"; style 7 also "<" ">" and "(" ")"). On success gives the
+// position of the left delimiter and the value.
+bool Nlw_NlSplitIndex(const char* name, size_t end, int style, size_t& left, int32_t& value);
+
+// What only a macro block carries.
+struct Nlw_NlBlock::MacroData {
+    std::vector<Nlw_NlBlock*> children;
+    std::vector<Nlw_NlSignal*> signals;
+    UT_DARRAY<Nlw_NlPinBus*> pinBuses;
+    UT_DARRAY<Nlw_NlBus*> signalBuses;
+    size_t pinCapacity = 0;
+    Nlw_NlNameIndex index;
 };

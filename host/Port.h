@@ -80,13 +80,16 @@ public:
     void SetChar(size_t pos, C c) {
         if (pos < s_.size()) s_[pos] = c;
     }
-    // The whole text read as an unsigned decimal number; 0 when it is not one.
+    // The whole text read as an unsigned decimal number; 0 (and *ok false)
+    // when it is not one or does not fit in 32 bits.
     uint32_t GetUINT32(bool* ok = nullptr) const;
 
     // Splits text at any of the separator characters. With skipEmpty, empty
     // pieces are dropped. A piece that begins with an open-quote character
-    // runs to the matching close-quote character, separators included; the
-    // quotes are removed.
+    // runs to the close-quote character at the same position in closeQuotes,
+    // separators included; the quotes are removed, text after the closing
+    // quote up to the next separator still belongs to the piece, and a
+    // quoted piece is kept even when empty. An unclosed quote runs to the end.
     static std::vector<StringBase> Split(const C* text, const C* separators, bool skipEmpty,
                                          const C* openQuotes, const C* closeQuotes);
 
@@ -134,19 +137,22 @@ public:
     Stream& operator=(const Stream&) = delete;
 
     bool isOpen() const { return fp_ != nullptr; }
-    // Reads the next line without its line end into buffer (at most size-1
-    // characters; the rest of a longer line is returned by the next calls).
-    // Returns 0 at the end of the file.
+    // Reads the next line without its line end ("\n" or "\r\n") into buffer
+    // (at most size-1 characters; the rest of a longer line is returned by
+    // the next calls). Returns 0 at the end of the file, and when size is
+    // below 2, 1 otherwise.
     int readline(char* buffer, int size);
-    // Reads the next whole line, whatever its length. Returns false at the end.
+    // Reads the next whole line, whatever its length, without its line end.
+    // Returns false at the end.
     bool readline(std::string& line);
     void close();
 
 private:
     friend class File;
-    // The next character of the file, or EOF; Peek does not consume it.
+    // The next character of the file, or EOF; Peek looks without consuming
+    // (up to one character beyond the next).
     int Get();
-    int Peek();
+    int Peek(size_t ahead = 0);
     bool Fill();
 
     FILE* fp_ = nullptr;
@@ -159,7 +165,8 @@ class File {
 public:
     static bool exist(const char* path);
     static bool isdir(const char* path);
-    // Opens a text file for reading into stream. Returns false when it cannot.
+    // Opens a file for reading into stream. Returns false when it cannot
+    // (a directory cannot be opened).
     static bool open(const char* path, Stream& stream, int flag = 0);
     // Reads a whole file. Returns false (and sets error) when it cannot.
     static bool readAll(const char* path, std::string& content, std::string* error = nullptr);

@@ -32,9 +32,10 @@ public:
 
 class UT_PATH {
 public:
-    // File name without directory and extension.
+    // File name without directory and extension. The extension starts at the
+    // last dot of the file name, unless that dot begins the name.
     static std::string GetBase(const char* path);
-    // The path without its extension, directory kept.
+    // The path without the extension of its file name, directory kept.
     static std::string GetRoot(const char* path);
     // The internal form uses "/" only; the external form is the platform's,
     // which on this host is the same.
@@ -77,8 +78,9 @@ private:
     int count_ = 0;
 };
 
-// A counting string cache: add() returns the name's entry with the number of
-// times it was added. Comparison is exact.
+// A counting string cache: add(name, n) adds n to the name's count and
+// returns its entry, so with n = 1 a count of 1 means the name is new.
+// Comparison is exact; entries stay where they are while the cache lives.
 class UT_NCH_CACHE {
 public:
     explicit UT_NCH_CACHE(bool flag = false) { (void)flag; }

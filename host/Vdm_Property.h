@@ -30,6 +30,9 @@ public:
     static Vdm_Property* NewInt(const char* name, int32_t v);
     static Vdm_Property* NewString(const char* name, const char* text);
     static Vdm_Property* NewList(const char* name);
+    // A list that refers to elements owned elsewhere: deleting it leaves
+    // its elements alone.
+    static Vdm_Property* NewBorrowingList(const char* name);
     static Vdm_Property* NewBits(const char* name, const char* bits);
     static Vdm_Property* NewTypeDef(const char* name, const std::vector<std::string>& values);
 
@@ -43,7 +46,9 @@ public:
     double GetFloat() const { return d_; }
     int32_t GetInt32() const { return i_; }
     // The text value of a string property, else null.
-    const char* GetString() const { return type_ == VDM_PROP_STRING || type_ == VDM_PROP_BITS ? text_.c_str() : nullptr; }
+    const char* GetString() const {
+        return type_ == VDM_PROP_STRING || type_ == VDM_PROP_BITS ? text_.c_str() : nullptr;
+    }
     void SetString(const char* text) { text_ = text ? text : ""; }
 
     // Value texts of a type-library definition (code 10).
@@ -53,8 +58,10 @@ public:
     size_t GetCount() const { return elems_.size(); }
     Vdm_Property* GetElement(size_t i) const { return elems_[i]; }
     const std::vector<Vdm_Property*>& GetElements() const { return elems_; }
-    // Appends an element (the list takes ownership) and returns it.
+    // Appends an element (an owning list takes ownership) and returns it.
     Vdm_Property* Add(Vdm_Property* p);
+    // Removes every element (deleting those an owning list owns).
+    void ClearElements();
     // Appends a new string element.
     Vdm_Property* CreatePropertyString(const char* name, const char* text);
 
@@ -66,6 +73,7 @@ private:
     std::string text_;
     std::vector<std::string> values_;
     std::vector<Vdm_Property*> elems_;
+    bool ownsElements_ = true;
 };
 
 // Carries properties in their stored order. Lookup by name is exact; a holder

@@ -53,7 +53,8 @@ void Nlw_Verilog::WriteDesign() {
     Nlw_Params* params = GetParams();
     Nlw_NlView* view = GetView();
     if (params == nullptr || view == nullptr) {
-        NLW_MSG().issueInternal("No netlist view or parameters were given to the Verilog writer.\n");
+        NLW_MSG().issueInternal(
+            "No netlist view or parameters were given to the Verilog writer.\n");
         return;
     }
 
@@ -102,7 +103,9 @@ const char* Nlw_Verilog::GetOutputName() const {
     return name ? name : "";
 }
 
-std::string Nlw_Verilog::GetOutputRoot() const { return UT_PATH::GetRoot(GetOutputName()); }
+std::string Nlw_Verilog::GetOutputRoot() const {
+    return UT_PATH::GetRoot(GetOutputName());
+}
 
 std::string Nlw_Verilog::GetOutputDirectory() const {
     Port::FileName fileName(GetOutputName());
@@ -176,6 +179,9 @@ std::string Nlw_Verilog::GetSdfFileName() const {
     const char* sdfPath = GetParams()->GetSdfPath();
     if (sdfPath == nullptr) return GetRootFileName(".sdf");
     const std::string base = UT_PATH::GetBase(UT_PATH::InternalPath(GetOutputName()).c_str());
+    // An empty timing directory is the working directory, as for the
+    // per-module timing files, not the file system root.
+    if (*sdfPath == '\0') return UT_PATH::ExternalPath(vorform("%s.sdf", base.c_str()));
     return UT_PATH::ExternalPath(vorform("%s/%s.sdf", sdfPath, base.c_str()));
 }
 

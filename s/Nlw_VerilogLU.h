@@ -14,9 +14,17 @@ public:
     Nlw_VerilogLU(const Nlw_VerilogLU& other);
     Nlw_VerilogLU& operator=(const Nlw_VerilogLU& other);
 
+    // With escaping on, only a space is illegal (an escaped identifier cannot
+    // hold one); with escaping off, every character outside the simple
+    // identifier rule is. Names already escaped are legal as they stand.
     bool IsLegal(Port::String name, bool isBused) override;
+    // Replaces each illegal character with "_": the result has the length of
+    // the name given, and a bus-bit name keeps its index.
     Port::String Legalize(Port::String name, bool isBused) override;
 
     bool writeEscapedNames = true;
     Nlw_Verilog* nlw = nullptr;
+
+protected:
+    bool UsesEscapedNames() const override { return writeEscapedNames; }
 };

@@ -3,8 +3,10 @@
 #pragma once
 
 #include <map>
+#include <memory>
 #include <string>
 #include <unordered_set>
+#include <vector>
 
 #include "../host/Nlw_NetlistWriter.h"
 #include "../host/Nlw_Writer.h"
@@ -15,6 +17,14 @@ struct Nlw_ICaseHash {
 };
 struct Nlw_ICaseEqual {
     bool operator()(const Port::String& a, const Port::String& b) const;
+};
+// Case-insensitive ordering that can be asked with a plain C string, so a
+// lookup by a block's type name needs no temporary string.
+struct Nlw_ICaseOrder {
+    using is_transparent = void;
+    bool operator()(const std::string& a, const std::string& b) const;
+    bool operator()(const std::string& a, const char* b) const;
+    bool operator()(const char* a, const std::string& b) const;
 };
 
 class Nlw_VerilogWriter : public Nlw_Writer {
@@ -51,9 +61,19 @@ public:
     }
     bool IsHexStringProperty(Vdm_Property* property, Nlw_NlBlock* block);
     bool IsBitStringProperty(Vdm_Property* property, Nlw_NlBlock* block);
+    size_t GetHexStringPropertyCount() const { return hexStringPropertyTable_.size(); }
+    size_t GetBitStringPropertyCount() const { return bitStringPropertyTable_.size(); }
 
 private:
     using NameSet = std::unordered_set<Port::String, Nlw_ICaseHash, Nlw_ICaseEqual>;
+    using NameMap = std::multimap<Port::String, Port::String>;
+
+    // One entry of the big-ending map as it applies to a cell type: every
+    // bus of the cell, or the bus of that name.
+    struct BusOrderRule {
+        bool allBuses;
+        Port::String busName;
+    };
 
     // Preamble.
     void WriteNewHeader(Nlw_NlBlock* block);
@@ -66,18 +86,49 @@ private:
     void WriteWireAssignments(Nlw_NlBlock* block);
     void WriteComponentInstantiationStatements(Nlw_NlBlock* block);
     void WritePortMaps(Nlw_NlBlock* instance);
+    void ApplyBigEndingOrder(Nlw_NlBlock* instance);
     // Tables.
     void InitHexStringPropertyTable();
     void InitBitStringPropertyTable();
     void InitBigEndingTimcellMap();
     void InitRecursiveInclusionMap();
+    void InitNameSet(NameSet& table, const char* key);
+    void InitNameMap(NameMap& map, const char* key, bool trace);
+    void BuildTypeIndexes();
     bool IsStringPropertyOfKind(Vdm_Property* property, Nlw_NlBlock* block, const char* marker,
                                 const NameSet& table);
+    // Parameters: the inline or defparam text of one element into line_;
+    // false when its type cannot be written.
+    bool FormatParam(Vdm_Property* element, Nlw_NlBlock* block, bool typed, bool inlineForm,
+                     const char* instance);
     // Cell models.
     void WriteIsmList(Nlw_NlBlock* block, UT_NCH_CACHE& cache);
+    bool CopyModelFile(const char* libraryName, const char* model);
+
+    // Appends " // AKA:<aka>" when also-known-as comments are asked and aka
+    // is set; line breaks in aka become blanks so the comment stays on its
+    // line.
+    void AppendAkaComment(std::string& out, const char* aka) const;
+    bool IsBlackBoxMode() const;
+
+    // The error issued when no installation root is known.
+    static const char* const kNoVornixError;
 
     NameSet hexStringPropertyTable_;
     NameSet bitStringPropertyTable_;
-    std::multimap<Port::String, Port::String> bigEndingTimcellMap_;
-    std::multimap<Port::String, Port::String> recursiveInclusionMap_;
+    NameMap bigEndingTimcellMap_;
+    NameMap recursiveInclusionMap_;
+
+    // The two maps by type name ignoring case, in map order, so that each
+    // instance finds its entries with one lookup.
+    std::map<std::string, std::vector<BusOrderRule>, Nlw_ICaseOrder> bigEndingByType_;
+    std::map<std::string, std::vector<Port::String>, Nlw_ICaseOrder> inclusionByType_;
+
+    // The property output filter handed to the base; shared by copies.
+    std::shared_ptr<Vdh_PropOutFilter> propFilter_;
+
+    // Scratch texts and index tuple reused for every line.
+    std::string line_;
+    std::string alias_;
+    DARRAY_Util_INT32 tuple_;
 };

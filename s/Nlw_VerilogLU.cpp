@@ -1,0 +1,79 @@
+// The Verilog name legalizer: the two questions the host legalizer asks of a
+// format.
+#include "Nlw_VerilogLU.h"
+
+#include <string>
+
+#include "../host/Nlw_Nl.h"
+#include "../host/Port.h"
+#include "../host/UT.h"
+#include "Nlw_Verilog.h"
+
+Nlw_VerilogLU::Nlw_VerilogLU(Nlw_Verilog* nlw, Nlw_NlView* view, bool first, bool second,
+                             bool third, bool fourth, bool fifth)
+    : Nlw_Nl_LU(view, third, fourth, fifth, first), writeEscapedNames(second), nlw(nlw) {}
+
+Nlw_VerilogLU::Nlw_VerilogLU(const Nlw_VerilogLU& other)
+    : Nlw_Nl_LU(other), writeEscapedNames(other.writeEscapedNames), nlw(other.nlw) {}
+
+Nlw_VerilogLU& Nlw_VerilogLU::operator=(const Nlw_VerilogLU& other) {
+    Nlw_Nl_LU::operator=(other);
+    writeEscapedNames = other.writeEscapedNames;
+    nlw = other.nlw;
+    return *this;
+}
+
+namespace {
+
+// With escaping on, the space is the only character an escaped identifier
+// cannot hold; with escaping off, the simple identifier rule applies.
+bool IsIllegalChar(unsigned char c, bool first, bool writeEscapedNames) {
+    if (writeEscapedNames) return c == ' ';
+    return !Nlw_Verilog::IsSimpleIdentifierChar(c, first);
+}
+
+}  // namespace
+
+bool Nlw_VerilogLU::IsLegal(Port::String name, bool isBused) {
+    if (nlw != nullptr && nlw->IsEscaped(name.c_str())) return true;
+    std::string text = name.str();
+    if (isBused) {
+        std::string base;
+        DARRAY_Util_INT32 indexes;
+        if (Nlw_NlBus::IsBusName(name.c_str(), base, &indexes)) text.swap(base);
+    }
+    for (size_t i = 0; i < text.size(); ++i) {
+        if (IsIllegalChar(static_cast<unsigned char>(text[i]), i == 0, writeEscapedNames))
+            return false;
+    }
+    return true;
+}
+
+Port::String Nlw_VerilogLU::Legalize(Port::String name, bool isBused) {
+    if (nlw != nullptr && nlw->IsEscaped(name.c_str())) return name;
+    DARRAY_Util_INT32 indexes;
+    bool isBusBit = false;
+    if (isBused) {
+        std::string base;
+        if (Nlw_NlBus::IsBusName(name.c_str(), base, &indexes)) {
+            isBusBit = true;
+            name = base.c_str();
+        }
+    }
+    const size_t length = name.length();
+    for (size_t i = 0; i < length; ++i) {
+        if (IsIllegalChar(static_cast<unsigned char>(name[i]), i == 0, writeEscapedNames))
+            name.SetChar(i, '_');
+    }
+    if (isBusBit) {
+        if (nlw != nullptr) {
+            name += nlw->GetIndexesString(&indexes);
+        } else {
+            const int type = Nlw_NlBus::GetOutputDelimiterType();
+            for (int32_t index : indexes)
+                name += vorform("%c%d%c", Nlw_NlBus::GetLeftDelimiter(type),
+                                static_cast<int>(index), Nlw_NlBus::GetRightDelimiter(type));
+        }
+    }
+    return name;
+}

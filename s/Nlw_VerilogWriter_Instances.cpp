@@ -1,0 +1,154 @@
+// Instance statements: cell type, parameters, instance name and the port map
+// that connects every pin by name.
+#include <cstring>
+
+#include "../host/Nlw_Nl.h"
+#include "../host/Nlw_Params.h"
+#include "../host/Port.h"
+#include "../host/UT.h"
+#include "Nlw_VerilogWriter.h"
+
+namespace {
+
+// The constant a pin is tied to when it has no signal, or null.
+inline Vdm_Property* TieOff(const Nlw_NlPin* pin) {
+    return pin->GetPropertyByName("TIEOFF");
+}
+
+void AppendInt(std::string& out, long value) {
+    out += std::to_string(value);
+}
+
+}  // namespace
+
+void Nlw_VerilogWriter::WriteComponentInstantiationStatements(Nlw_NlBlock* block) {
+    Nlw_NetlistWriter* nlw = GetNlw();
+    const bool defparamMode = Port_Env::GetEnv("NLW_VERILOG_DEFPARM") != nullptr;
+
+    for (Nlw_NlBlock* child : block->GetChildren()) {
+        if (!child || !nlw->IsInstantiatable(child)) continue;
+
+        if (defparamMode && (child->IsTimcell() || child->IsFuncell()))
+            WriteExternalProperties(FindExternalProperties(child->GetDataBlock()), child);
+
+        line_ = nlw->Escape(child->GetTypeName(), 0);
+        line_ += ' ';
+        WriteI(line_.c_str());
+
+        if (!defparamMode) WriteInlineParamStatements(child);
+        line_ = nlw->Escape(child->GetInstanceName(), 0);
+        line_ += " (";
+        AppendAkaComment(line_, child->GetAka());
+        if (defparamMode)
+            WriteL(line_.c_str());
+        else
+            WriteIL(line_.c_str());
+
+        UpIndent();
+        // Constant inputs of the cell: the last character drives I0.
+        if (Vdm_Property* bitInit = child->GetPropertyByName("NLW_BIT_INIT")) {
+            const char* bits = bitInit->GetString();
+            const size_t length = bits ? std::strlen(bits) : 0;
+            for (size_t i = 0; i < length; ++i) {
+                line_ = ".I";
+                AppendInt(line_, static_cast<long>(i));
+                line_ += "(1'b";
+                line_ += bits[length - 1 - i];
+                line_ += "),";
+                WriteIL(line_.c_str());
+            }
+        }
+        WritePortMaps(child);
+        DownIndent();
+        WriteIL(");");
+    }
+}
+
+void Nlw_VerilogWriter::ApplyBigEndingOrder(Nlw_NlBlock* instance) {
+    auto found = bigEndingByType_.find(instance->GetTypeName());
+    if (found == bigEndingByType_.end()) return;
+    const UT_DARRAY<Nlw_NlPinBus*>* buses = instance->GetPinBuses();
+    if (!buses) return;
+    for (const BusOrderRule& rule : found->second) {
+        for (Nlw_NlPinBus* bus : *buses) {
+            if (!bus) continue;
+            if (!rule.allBuses &&
+                UT_STR::ICompare(rule.busName.c_str(), bus->GetWritableName()) != 0)
+                continue;
+            for (int d = 0; d < bus->GetDimension(); ++d) bus->SetOrder(d, BUS_ORDER_LSB_FIRST);
+            if (!rule.allBuses) break;
+        }
+    }
+}
+
+void Nlw_VerilogWriter::WritePortMaps(Nlw_NlBlock* instance) {
+    Nlw_NetlistWriter* nlw = GetNlw();
+    int count = 0;
+    auto separator = [&]() {
+        if (count++ > 0) WriteL(",");
+    };
+
+    for (Nlw_NlPin& pin : instance->GetPins()) {
+        if (!pin.IsVisible() || pin.IsBused()) continue;
+        if (Nlw_NlSignal* signal = pin.GetSignal()) {
+            separator();
+            line_ = '.';
+            line_ += nlw->Escape(pin.GetWritableName(), 0);
+            line_ += '(';
+            line_ += nlw->Escape(signal->GetWritableName(), signal->IsBused() ? 1 : 0);
+            line_ += ')';
+            WriteI(line_.c_str());
+        } else if (Vdm_Property* tie = TieOff(&pin)) {
+            separator();
+            line_ = '.';
+            line_ += nlw->Escape(pin.GetWritableName(), 0);
+            line_ += "(1'b";
+            AppendInt(line_, tie->GetInt32());
+            line_ += ')';
+            WriteI(line_.c_str());
+        }
+    }
+
+    if (instance->IsTimcell() && !bigEndingByType_.empty()) ApplyBigEndingOrder(instance);
+
+    if (const UT_DARRAY<Nlw_NlPinBus*>* buses = instance->GetPinBuses()) {
+        for (Nlw_NlPinBus* bus : *buses) {
+            if (!bus || !bus->IsValid()) continue;
+            separator();
+            const int dimensions = bus->GetDimension();
+            tuple_.Clear();
+            for (int d = 0; d < dimensions; ++d)
+                tuple_.Add(bus->GetOrder(d) != 0 ? bus->GetLSB(d) : bus->GetMSB(d));
+
+            const char* busName = bus->GetWritableName();
+            line_ = '.';
+            line_ += nlw->Escape(busName, 0);
+            bool first = true;
+            while (bus->HasMore(tuple_)) {
+                line_ += first ? "({" : ", ";
+                first = false;
+                alias_ = busName;
+                alias_ += nlw->GetIndexesString(&tuple_);
+                Nlw_NlPin* bit = instance->GetPinByAlias(alias_.c_str());
+                Vdm_Property* tie = nullptr;
+                if (bit && bit->GetSignal()) {
+                    Nlw_NlSignal* signal = bit->GetSignal();
+                    line_ += nlw->Escape(signal->GetWritableName(), signal->IsBused() ? 1 : 0);
+                } else if (bit && (tie = TieOff(bit))) {
+                    line_ += "1'b";
+                    AppendInt(line_, tie->GetInt32());
+                } else {
+                    // No net and no constant: the bit is left floating; an empty
+                    // element would not be legal Verilog.
+                    line_ += "1'bz";
+                }
+                bus->Next(tuple_, dimensions - 1);
+            }
+            // A bus without bits is left unconnected.
+            line_ += first ? "()" : "})";
+            WriteI(line_.c_str());
+        }
+    }
+
+    if (count > 0) WriteL("");
+}

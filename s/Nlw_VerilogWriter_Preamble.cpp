@@ -1,0 +1,228 @@
+// What a netlist file holds besides its modules: the commented file head,
+// the time scale and library directives, and the timing annotation statement
+// of a module.
+#include <string>
+
+#include "../host/Nlw_Nl.h"
+#include "../host/Nlw_Params.h"
+#include "../host/Nlw_Util.h"
+#include "../host/Port.h"
+#include "../host/UT.h"
+#include "Nlw_VerilogWriter.h"
+
+namespace {
+
+const char* const kRule =
+    "////////////////////////////////////////////////////////////////////////////////";
+const char* const kSeparator = "//             ";
+
+}  // namespace
+
+const char* const Nlw_VerilogWriter::kNoVornixError =
+    " The VORNIX environment variable must be set for this program towork. Please check your "
+    "environment to ensure that it is setup properly to use the Vornix tools\n";
+
+namespace {
+
+const char* OrEmpty(const char* text) {
+    return text ? text : "";
+}
+
+const char* DesignName(Nlw_NetlistWriter* nlw) {
+    return nlw->GetDesign() ? nlw->GetDesign()->GetName() : "";
+}
+
+// Disclaimer blocks of the short module-file head.
+const char* const kSimDisclaimer[] = {
+    "// This verilog netlist is a simulation model and uses simulation ",
+    "// primitives which may not represent the true implementation of the ",
+    "// device, however the netlist is functionally correct and should not ",
+    "// be modified. This file cannot be synthesized and should only be used ",
+    "// with supported simulation tools.",
+};
+const char* const kEcnDisclaimer[] = {
+    "// This verilog netlist is a simulation model and uses library ",
+    "// primitives which may not represent the true implementation of ",
+    "// the device, however the netlist is functionally correct and ",
+    "// should not be modified. This file cannot be synthesized and ",
+    "// should only be used with supported equivalence checking tools. ",
+};
+const char* const kStaDisclaimerLast =
+    "// should only be used with supported static timing analysis tools. ";
+
+}  // namespace
+
+void Nlw_VerilogWriter::WriteNewHeader(Nlw_NlBlock* block) {
+    Nlw_NetlistWriter* nlw = GetNlw();
+    Nlw_Params* params = GetParams();
+    Nlw_NlView* view = block ? block->GetView() : nlw->GetView();
+
+    WriteL(kRule);
+    WriteL("// Copyright (c) Vornix. All rights reserved.");
+    WriteL(kRule);
+
+    // The emblem: a chip with its pins; the labels start in column 19.
+    WriteL("//");
+    WriteL("//       | |");
+    WriteL("//    +------+    Vendor: Vornix");
+    line_ = "//  --|      |--  Version: ";
+    line_ += OrEmpty(nlw->GetApplicationVersion());
+    WriteL(line_.c_str());
+    line_ = "//  --|  VX  |--  Application: ";
+    line_ += OrEmpty(nlw->GetApplicationName());
+    WriteL(line_.c_str());
+    line_ = "//  --|      |--  Filename: ";
+    line_ += OrEmpty(block ? block->GetFileBaseName() : nullptr);
+    line_ += ".v";
+    WriteL(line_.c_str());
+    line_ = "//    +------+    Timestamp: ";
+    line_ += OrEmpty(Nlw_Util::GetTimeStampString(1));
+    WriteL(line_.c_str());
+    WriteL("//       | |");
+    WriteL("//");
+
+    WriteL(kSeparator);
+    WriteL(vorform("// Command\t: %s", OrEmpty(params->GetCommandLine())));
+    WriteL(vorform("// Device\t: %s", OrEmpty(view ? view->GetDeviceInfo() : nullptr)));
+    WriteL(vorform("// Input file\t: %s", OrEmpty(params->GetInputFileName())));
+    WriteL(vorform("// Output file\t: %s", OrEmpty(params->GetOutputFileName())));
+    WriteL(vorform("// # of Modules\t: %d", view ? static_cast<int>(view->GetNumMacros()) : 0));
+    WriteL(vorform("// Design Name\t: %s", DesignName(nlw)));
+    if (block && block->GetParent())
+        WriteL(vorform("// Module Name: %s", OrEmpty(block->GetTypeName())));
+    WriteL(vorform("// Vornix        : %s", OrEmpty(params->GetVornix())));
+    WriteL(kSeparator);
+    WriteL("// Purpose:    ");
+
+    if (params->GetEcnMode()) {
+        WriteL("//     This verilog netlist is a verification model and uses library ");
+        WriteL("//     primitives which may not represent the true implementation of ");
+        WriteL("//     the device, however the netlist is functionally correct and ");
+        WriteL("//     should not be modified. This file cannot be synthesized and ");
+        WriteL("//     should only be used with supported equivalence checking tools.");
+    }
+    if (params->GetSimMode()) {
+        WriteL("//     This verilog netlist is a verification model and uses simulation ");
+        WriteL("//     primitives which may not represent the true implementation of the ");
+        WriteL("//     device, however the netlist is functionally correct and should not ");
+        WriteL("//     be modified. This file cannot be synthesized and should only be used ");
+        WriteL("//     with supported simulation tools.");
+    }
+    if (params->GetStaMode()) {
+        WriteL("//     This verilog netlist is a verification model and uses library ");
+        WriteL("//     primitives which may not represent the true implementation of ");
+        WriteL("//     the device, however the netlist is functionally correct and ");
+        WriteL("//     should not be modified. This file cannot be synthesized and ");
+        WriteL("//     should only be used with supported static timing analysis tools.");
+    }
+
+    WriteL(kSeparator);
+    WriteL("// Reference:  ");
+    // Static timing users need only the netlist guide.
+    Write("//     Vornix Netlist Writer User Guide", 0, 0);
+    if (params->GetStaMode())
+        WriteL("");
+    else
+        WriteL(" and Vornix Simulation Library Guide");
+
+    WriteL(kSeparator);
+    WriteL(kRule);
+    WriteL("");
+
+    WriteL(params->GetWritePsTimePrecision() ? "`timescale 1 ns/1 ps" : "`timescale 1 ns/10 ps");
+    if (params->GetWriteUseLib())
+        WriteLibrarySearch(params->GetFuncellMode() ? "funcells" : "timcells");
+    WriteL("");
+}
+
+void Nlw_VerilogWriter::WriteLibrarySearch(const char* libraryName) {
+    const Port::PathList& roots = Port::VornixPath::GetInstance();
+    bool found = false;
+    if (roots.size() == 0) {
+        NLW_MSG().issueError("%s", kNoVornixError);
+    } else {
+        for (size_t i = 0; i < roots.size() && !found; ++i) {
+            const char* root = roots[i];
+            if (!Port::File::exist(root) || !Port::File::isdir(root)) continue;
+            std::string dir = root;
+            dir += "/verilog/src/";
+            dir += libraryName;
+            dir = UT_PATH::ExternalPath(dir.c_str());
+            if (Port::File::exist(dir.c_str()) && Port::File::isdir(dir.c_str())) {
+                line_ = "`uselib dir=";
+                line_ += dir;
+                line_ += " libext=.v";
+                WriteL(line_.c_str());
+                found = true;
+            }
+        }
+    }
+    if (!found)
+        NLW_MSG().issueError(
+            "Timcell library directory not found, the `uselib constructis omitted for the -ul "
+            "option.\n");
+}
+
+void Nlw_VerilogWriter::WriteSdfAnnotate(Nlw_NlBlock* block) {
+    Nlw_Params* params = GetParams();
+    if (!block->GetPropertyByName("NLW_SDFANNOTATED") || !params->GetSdfAnnotate() ||
+        Port_Env::GetEnv("VOR_SIMMODEL_DISABLE_SDF_ANNOTATE"))
+        return;
+
+    std::string name = OrEmpty(params->GetSdfPath());
+    if (!name.empty()) name += '/';
+    name += OrEmpty(block->GetFileBaseName());
+    name += ".sdf";
+    name = UT_PATH::InternalPath(name.c_str());
+
+    // The name goes into a string literal: a quote, a backslash or a line
+    // break in it must not end or break the literal.
+    line_ = "initial $sdf_annotate(\"";
+    for (char c : name) {
+        switch (c) {
+            case '"':
+            case '\\':
+                line_ += '\\';
+                line_ += c;
+                break;
+            case '\n':
+                line_ += "\\n";
+                break;
+            case '\r':
+                line_ += "\\r";
+                break;
+            default:
+                line_ += c;
+        }
+    }
+    line_ += "\");";
+    WriteIL(line_.c_str());
+}
+
+void Nlw_VerilogWriter::WriteMHHeader(Nlw_NlBlock* block) {
+    Nlw_NetlistWriter* nlw = GetNlw();
+    Nlw_Params* params = GetParams();
+
+    WriteL(vorform("// Vornix Verilog netlist produced by %s application (version %s)",
+                   OrEmpty(nlw->GetApplicationName()), OrEmpty(nlw->GetApplicationVersion())));
+    WriteL("// This netlist is one of multiple netlists created for the");
+    WriteL("// design using tessel's write multiple hierarchy files option.");
+    WriteL("");
+    WriteL(vorform("// Design name : %s", DesignName(nlw)));
+    WriteL(vorform("// Module name : %s", OrEmpty(block ? block->GetTypeName() : nullptr)));
+    WriteL("");
+
+    if (params->GetEcnMode()) {
+        for (const char* text : kEcnDisclaimer) WriteL(text);
+    } else if (params->GetStaMode()) {
+        for (int i = 0; i < 4; ++i) WriteL(kEcnDisclaimer[i]);
+        WriteL(kStaDisclaimerLast);
+    } else {
+        for (const char* text : kSimDisclaimer) WriteL(text);
+    }
+    WriteL("");
+
+    WriteL(params->GetWritePsTimePrecision() ? "`timescale 1 ns/1 ps" : "`timescale 1 ns/10 ps");
+    if (params->GetWriteUseLib()) WriteLibrarySearch("timcells");
+    WriteL("");
+}

@@ -1,0 +1,76 @@
+// A module's internal nets: wire declarations and the assign statement that
+// joins each port to its net where the two names differ.
+#include <cstring>
+
+#include "../host/Nlw_Nl.h"
+#include "../host/Nlw_Params.h"
+#include "Nlw_VerilogWriter.h"
+
+void Nlw_VerilogWriter::WriteWireDeclarations(Nlw_NlBlock* block) {
+    Nlw_NetlistWriter* nlw = GetNlw();
+
+    for (Nlw_NlSignal* signal : block->GetSignals()) {
+        if (!signal || !signal->IsVisible() || signal->IsBused()) continue;
+        line_ = "wire ";
+        line_ += nlw->Escape(signal->GetWritableName(), 0);
+        line_ += ';';
+        AppendAkaComment(line_, signal->GetAka());
+        WriteIL(line_.c_str());
+    }
+
+    if (const UT_DARRAY<Nlw_NlBus*>* buses = block->GetSignalBuses()) {
+        for (Nlw_NlBus* bus : *buses) {
+            if (!bus || !bus->IsValid()) continue;
+            line_ = "wire ";
+            line_ += nlw->GetRangeString(bus);
+            line_ += ' ';
+            line_ += nlw->Escape(bus->GetWritableName(), 0);
+            line_ += ';';
+            AppendAkaComment(line_, bus->GetAka());
+            WriteIL(line_.c_str());
+        }
+    }
+}
+
+void Nlw_VerilogWriter::WriteWireAssignments(Nlw_NlBlock* block) {
+    Nlw_NetlistWriter* nlw = GetNlw();
+    int count = 0;
+    std::string pinSide;
+
+    for (Nlw_NlPin& pin : block->GetPins()) {
+        if (!pin.IsVisible()) continue;
+        Nlw_NlSignal* signal = pin.GetChildSignal();
+        if (!signal) continue;
+        if (std::strcmp(pin.GetWritableName(), signal->GetWritableName()) == 0) continue;
+
+        const int direction = pin.GetDirection();
+        // An inout port only needs the assignment when something inside
+        // drives its net.
+        if (direction != NLW_DIR_INPUT && direction != NLW_DIR_OUTPUT && !signal->FindDriverPin())
+            continue;
+
+        // Global signals are named exactly as the chipwide module names them.
+        const bool global = signal->GetPropertyByName("NLW_GLOBAL_SIGNAL") != nullptr;
+        pinSide = nlw->Escape(pin.GetWritableName(), pin.IsBused() ? 1 : 0);
+        const char* signalSide =
+            global ? signal->GetWritableName()
+                   : nlw->Escape(signal->GetWritableName(), signal->IsBused() ? 1 : 0);
+
+        if (count++ == 0) {
+            WriteIL("assign");
+            UpIndent();
+        } else {
+            WriteL(",");
+        }
+        const bool input = direction == NLW_DIR_INPUT;
+        line_ = input ? signalSide : pinSide.c_str();
+        line_ += " = ";
+        WriteI(line_.c_str());
+        Write(input ? pinSide.c_str() : signalSide, 0, 0);
+    }
+
+    if (count > 0) {
+        WriteL(";");
+        DownIndent();
+    }
+}

@@ -1,0 +1,152 @@
+// The stock netlist head, the run-parameter block and the closing notices.
+#include "../host/Nlw_Nl.h"
+#include "../host/Nlw_Writer.h"
+#include "../host/Port.h"
+#include "../host/UT.h"
+#include "Nlw_Verilog.h"
+
+namespace {
+
+const char* Text(const char* s) {
+    return s ? s : "";
+}
+
+// A global signal makes the chipwide module necessary when nothing in the
+// design drives it and it stands for no pin: the chipwide module then
+// provides it.
+bool IsUndrivenGlobal(const Nlw_NlSignal* signal) {
+    return signal != nullptr && signal->FindDriver(false, false) == nullptr &&
+           signal->GetRefPin() == nullptr;
+}
+
+}  // namespace
+
+void Nlw_Verilog::WriteHeader(Nlw_Writer* writer) {
+    Nlw_Params* params = GetParams();
+    if (writer == nullptr || params == nullptr) return;
+    if (params->GetEcnMode())
+        WriteEcnHeader(writer);
+    else if (params->GetStaMode())
+        WriteStaHeader(writer);
+    else
+        WriteSimHeader(writer);
+
+    writer->WriteL(params->GetWritePsTimePrecision() ? "`timescale 1 ns/1 ps"
+                                                     : "`timescale 1 ns/10 ps");
+    if (params->GetWriteUseLib()) WriteUseLib(writer);
+    if (IsChipwideNeeded() && !params->GetWriteTestFile()) IssueChipwideNotice();
+    writer->WriteL("");
+}
+
+// The library directive names the first installation root that holds the
+// timcell sources; without one the directive is left out and the user is
+// told why.
+void Nlw_Verilog::WriteUseLib(Nlw_Writer* writer) {
+    const Port::PathList roots = Port::VornixPath::GetInstance();
+    if (roots.size() == 0) {
+        NLW_MSG().issueError(
+            " The VORNIX environment variable must be set for this program towork. Please "
+            "check your environment to ensure that it is setup properly to use the Vornix "
+            "tools\n");
+    } else {
+        for (size_t i = 0; i < roots.size(); ++i) {
+            const char* root = roots[i];
+            if (!Port::File::exist(root) || !Port::File::isdir(root)) continue;
+            const std::string candidate =
+                UT_PATH::ExternalPath(vorform("%s/verilog/src/timcells", root));
+            if (Port::File::exist(candidate.c_str()) && Port::File::isdir(candidate.c_str())) {
+                writer->WriteL(vorform("`uselib dir=%s libext=.v", candidate.c_str()));
+                return;
+            }
+        }
+    }
+    NLW_MSG().issueError(
+        "Timcell library directory not found, the `uselib constructis omitted for the -ul "
+        "option.\n");
+}
+
+void Nlw_Verilog::WriteSimHeader(Nlw_Writer* writer) {
+    writer->WriteL("// This verilog netlist is a simulation model and uses simulation ");
+    writer->WriteL("// primitives which may not represent the true implementation of the ");
+    writer->WriteL("// device, however the netlist is functionally correct and should not ");
+    writer->WriteL("// be modified. This file cannot be synthesized and should only be used ");
+    writer->WriteL("// with supported simulation tools.");
+    writer->WriteL("");
+}
+
+namespace {
+
+void WriteLibraryDisclaimerStart(Nlw_Writer* writer) {
+    writer->WriteL("// This verilog netlist is a simulation model and uses library ");
+    writer->WriteL("// primitives which may not represent the true implementation of ");
+    writer->WriteL("// the device, however the netlist is functionally correct and ");
+    writer->WriteL("// should not be modified. This file cannot be synthesized and ");
+}
+
+}  // namespace
+
+void Nlw_Verilog::WriteEcnHeader(Nlw_Writer* writer) {
+    WriteLibraryDisclaimerStart(writer);
+    writer->WriteL("// should only be used with supported equivalence checking tools. ");
+    writer->WriteL("");
+}
+
+void Nlw_Verilog::WriteStaHeader(Nlw_Writer* writer) {
+    WriteLibraryDisclaimerStart(writer);
+    writer->WriteL("// should only be used with supported static timing analysis tools. ");
+    writer->WriteL("");
+}
+
+void Nlw_Verilog::WriteParams(Nlw_Writer* writer) {
+    Nlw_Params* params = GetParams();
+    if (writer == nullptr || params == nullptr) return;
+    Nlw_NlView* view = GetView();
+    const int numModules = view ? static_cast<int>(view->GetNumMacros()) : 0;
+    const char* device = view ? view->GetDeviceInfo() : nullptr;
+    writer->WriteL(vorform("// Command      : %s", Text(params->GetCommandLine())));
+    writer->WriteL(vorform("// Input file   : %s", Text(params->GetInputFileName())));
+    writer->WriteL(vorform("// Output file  : %s", Text(params->GetOutputFileName())));
+    writer->WriteL(vorform("// Design name  : %s", GetDesignName()));
+    writer->WriteL(vorform("// # of Modules : %d", numModules));
+    writer->WriteL(vorform("// Vornix       : %s", Text(params->GetVornix())));
+    writer->WriteL(vorform("// Device       : %s", device ? device : "NULL"));
+    writer->WriteL("");
+}
+
+bool Nlw_Verilog::IsChipwideNeeded() {
+    Nlw_NlView* view = GetView();
+    if (view == nullptr) return false;
+    if (IsUndrivenGlobal(view->GetSetReset())) return true;
+    if (IsUndrivenGlobal(view->GetTristate())) return true;
+    Nlw_NlBlock* top = view->GetRootMacro();
+    return top != nullptr && top->GetPropertyByName("NLW_CHIPWIDE_MODULE") != nullptr;
+}
+
+void Nlw_Verilog::IssueChipwideNotice() {
+    NLW_MSG().issueInfo(
+        "If Verilog simulation is performed outside the Atelier environment, please add the "
+        "chipwide module to the simulation invocation command. The simulation chapter of the "
+        "design guide, at https://docs.example.org/atelier/simulation, describes the chipwide "
+        "module and how to compile it. \n");
+}
+
+void Nlw_Verilog::PrintInfoMessage() {
+    Nlw_Params* params = GetParams();
+    if (params->GetSimMode()) {
+        const char* lib = params->GetFuncellMode() ? "FUNCELL" : "TIMCELL";
+        NLW_MSG().issueInfo(
+            "The generated Verilog netlist contains Vornix %s simulation primitives and has to "
+            "be used with %s simulation library for correct compilation and simulation. \n",
+            lib, lib);
+        NLW_MSG().issueInfo(
+            "Setup Simulation - To perform a setup simulation, specify values in the Maximum "
+            "(MAX) field with the following command line modifier:  -SDFMAX\n");
+        NLW_MSG().issueInfo(
+            "Hold Simulation - To perform the most accurate hold simulation, specify values in "
+            "the Minimum (MIN) field with the following command line modifier:  -SDFMIN\n");
+        NLW_MSG().issueInfo(
+            "For more information on how to pass the SDF switches to the simulator, see your "
+            "Simulator tool documentation.\n");
+    }
+    if (IsChipwideNeeded() && !params->GetWriteTestFile()) IssueChipwideNotice();
+}

@@ -1,0 +1,148 @@
+// Turns a cell property into the Verilog text of the parameter that the
+// simulation library defines for the cell type.
+#include <cstdint>
+#include <string>
+#include <vector>
+
+#include "../host/Nlw_Nl.h"
+#include "../host/Port.h"
+#include "../host/UT.h"
+#include "../host/Vdm_Property.h"
+#include "Nlw_Verilog.h"
+
+namespace {
+
+bool TypeIs(const Nlw_Property& definition, const char* type) {
+    return definition.GetType().Compare(type, Port::String::IgnoreCase) == 0;
+}
+
+// The parameter a property stands for: the initial-state properties of the
+// flip-flops all set the library's INIT parameter.
+Port::String ParameterName(const char* propertyName) {
+    if (UT_STR::ICompare(propertyName, "INITSTATE") == 0 ||
+        UT_STR::ICompare(propertyName, "INIT_BIT") == 0)
+        return Port::String("INIT");
+    return Port::String(propertyName);
+}
+
+const Nlw_Property* FindDefinition(const Nlw_SimPropTable& table, const char* typeName,
+                                   const Port::String& parameterName) {
+    // The table orders its keys ignoring case, so find gives the entry whose
+    // key equals the type name ignoring case.
+    const auto entry = table.find(Port::String(typeName));
+    if (entry == table.end() || entry->second == nullptr) return nullptr;
+    for (const Nlw_Property& definition : *entry->second) {
+        if (definition.GetName().Compare(parameterName.c_str(), Port::String::IgnoreCase) == 0)
+            return &definition;
+    }
+    return nullptr;
+}
+
+// A sized vector literal such as 16'hABCD or 4'b0101. The width comes from the
+// definition's default (width, apostrophe, value); a default without that
+// form gives the width of the value itself. The value is padded or cut to
+// the width's digit count, with a warning.
+Port::String MakeVectorText(Nlw_NetlistWriter& nlw, const Nlw_Property& definition,
+                            const Port::String& parameterName, const char* text, bool hex) {
+    Port::String value(text);
+    const uint32_t ownWidth = static_cast<uint32_t>(hex ? 4 * value.length() : value.length());
+    const std::vector<Port::String> pieces =
+        Port::String::Split(definition.GetDefault().c_str(), "'", true, "", "");
+    std::string widthText = pieces.size() == 2 ? pieces[0].str() : std::to_string(ownWidth);
+    bool isNumber = false;
+    uint32_t width = Port::String(widthText).GetUINT32(&isNumber);
+    // A width that is no decimal number, or zero, would make an unusable
+    // literal: the value's own width stands in for it.
+    if (!isNumber || width == 0) {
+        width = ownWidth;
+        widthText = std::to_string(ownWidth);
+    }
+    const size_t digits = hex ? width / 4 + (width % 4 != 0 ? 1 : 0) : width;
+    if (value.length() != digits) {
+        if (hex)
+            NLW_MSG().issueWarning("Padding or triming the value for hex property %s:\n",
+                                   parameterName.c_str());
+        else
+            NLW_MSG().issueWarning("Padding or triming the value for binary property %s:\n",
+                                   parameterName.c_str());
+        nlw.PadOrTrim(digits, value, "0");
+    }
+    return Port::String(vorform(hex ? "%s'h%s" : "%s'b%s", widthText.c_str(), value.c_str()));
+}
+
+}  // namespace
+
+unsigned char Nlw_Verilog::AddIfSimulatableProperty(Nlw_NlBlock* block, Vdm_Property* property,
+                                                    Vdm_Property* list) {
+    if (block == nullptr || property == nullptr || list == nullptr) return 0;
+    const Port::String name = ParameterName(property->GetName());
+    const Nlw_Property* definition = FindDefinition(simPropTable, block->GetTypeName(), name);
+    if (definition == nullptr) return 0;
+
+    const char* expected = definition->GetType().c_str();
+    Port::String text;
+    switch (property->GetType()) {
+        case VDM_PROP_BOOL:
+            if (!TypeIs(*definition, "BL")) {
+                NLW_MSG().issueWarning(
+                    "Mismatched property type detected - type %s expected for property %s:, "
+                    "but type bool detected, ignored.\n",
+                    expected, name.c_str());
+                return 0;
+            }
+            text = "true";
+            break;
+        case VDM_PROP_FLOAT:
+            if (!TypeIs(*definition, "F")) {
+                NLW_MSG().issueWarning(
+                    "Mismatched property type detected - type %s expected for property %s:, "
+                    "but type float detected, ignored.\n",
+                    expected, name.c_str());
+                return 0;
+            }
+            text = vorform("%f", property->GetFloat());
+            break;
+        case VDM_PROP_INT:
+            if (TypeIs(*definition, "I")) {
+                text = vorform("%d", static_cast<int>(property->GetInt32()));
+            } else if (TypeIs(*definition, "S")) {
+                text = vorform("\"%d\"", static_cast<int>(property->GetInt32()));
+            } else {
+                NLW_MSG().issueWarning(
+                    "Mismatched property type detected - type %s expected for property %s:, "
+                    "but type integer detected, ignored.\n",
+                    expected, name.c_str());
+                return 0;
+            }
+            break;
+        case VDM_PROP_STRING: {
+            const char* value = property->GetString();
+            if (value == nullptr) value = "";
+            if (TypeIs(*definition, "S")) {
+                text = vorform("\"%s\"", value);
+            } else if (TypeIs(*definition, "BL")) {
+                Port::String upper(value);
+                upper.MakeUpper();
+                text = vorform("\"%s\"", upper.c_str());
+            } else if (TypeIs(*definition, "HV")) {
+                text = MakeVectorText(*this, *definition, name, value, true);
+            } else if (TypeIs(*definition, "BV")) {
+                text = MakeVectorText(*this, *definition, name, value, false);
+            } else if (TypeIs(*definition, "F")) {
+                text = value;
+            } else {
+                NLW_MSG().issueWarning(
+                    "Mismatched property type detected - type %s expected for property %s:, "
+                    "but type string detected, ignored.\n",
+                    expected, name.c_str());
+                return 0;
+            }
+            break;
+        }
+        default:
+            NLW_MSG().issueWarning("Invalid property type detected - %s, ignored.\n", name.c_str());
+            return 0;
+    }
+    list->CreatePropertyString(name.c_str(), text.c_str());
+    return 1;
+}

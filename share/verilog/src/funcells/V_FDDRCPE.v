@@ -1,0 +1,37 @@
+// V_FDDRCPE: dual-rate D flip-flop with clock enable, asynchronous clear
+// (before preset) and preset, starting from INIT. Each clock has its own
+// register; Q shows the C0 register while C0 is 1 and the C1 register while
+// it is 0, and a register whose clock edge comes with CE 0 takes the other
+// one's value, which is the dual-rate behaviour when C1 is the inverse of
+// C0.
+module V_FDDRCPE (
+    (* clkbuf_sink *) input C0,
+    (* clkbuf_sink *) input C1,
+    input CE,
+    input CLR,
+    input PRE,
+    input D0,
+    input D1,
+    output Q
+);
+  parameter [0:0] INIT = 1'b0;
+
+  reg q0, q1;
+
+  initial begin
+    q0 = INIT;
+    q1 = INIT;
+  end
+
+  always @(posedge C0 or posedge CLR or posedge PRE)
+    if (CLR) q0 <= 1'b0;
+    else if (PRE) q0 <= 1'b1;
+    else q0 <= CE ? D0 : q1;
+
+  always @(posedge C1 or posedge CLR or posedge PRE)
+    if (CLR) q1 <= 1'b0;
+    else if (PRE) q1 <= 1'b1;
+    else q1 <= CE ? D1 : q0;
+
+  assign Q = C0 ? q0 : q1;
+endmodule

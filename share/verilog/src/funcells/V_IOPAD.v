@@ -1,0 +1,5 @@
+// V_IOPAD: bidirectional pad; PAD stands for the package pin.
+module V_IOPAD (
+    inout PAD
+);
+endmodule

@@ -1,0 +1,5 @@
+// V_IPAD: input pad; PAD stands for the package pin.
+module V_IPAD (
+    output PAD
+);
+endmodule

@@ -1,0 +1,51 @@
+// V_FDDRRSE: dual-rate D flip-flop with synchronous reset and set. On the
+// rising edge of C0 (C1) Q takes 0 when R is 1, else 1 when S is 1, else D0
+// (D1) when the clock enable CE is 1. While the global set/reset
+// chipwide.GSR is 1 the flop holds INIT.
+`timescale 1 ns/1 ps
+module V_FDDRRSE (C0, C1, CE, R, S, D0, D1, Q);
+  parameter [0:0] INIT = 1'b0;
+  parameter XON = "TRUE";
+  parameter MSGON = "TRUE";
+  input C0, C1, CE, R, S, D0, D1;
+  output Q;
+
+  wire gsr = chipwide.GSR;
+  reg q_out;
+  reg notifier;
+
+  initial q_out = INIT;
+
+  always @(posedge gsr) q_out <= INIT;
+  always @(posedge C0) if (gsr !== 1'b1) q_out <= next(q_out, D0);
+  always @(posedge C1) if (gsr !== 1'b1) q_out <= next(q_out, D1);
+
+  always @(notifier) if (XON == "TRUE") q_out <= 1'bx;
+
+  assign Q = q_out;
+
+  // The state after a clock edge with data d.
+  function next;
+    input q, d;
+    if (R === 1'b1) next = 1'b0;
+    else if (R !== 1'b0) next = 1'bx;
+    else if (S === 1'b1) next = 1'b1;
+    else if (S !== 1'b0) next = 1'bx;
+    else if (CE === 1'b1) next = d;
+    else if (CE !== 1'b0 && q !== d) next = 1'bx;
+    else next = q;
+  endfunction
+
+  specify
+    (posedge C0 => (Q +: D0)) = (0, 0);
+    (posedge C1 => (Q +: D1)) = (0, 0);
+    $setuphold(posedge C0, D0, 0, 0, notifier);
+    $setuphold(posedge C1, D1, 0, 0, notifier);
+    $setuphold(posedge C0, CE, 0, 0, notifier);
+    $setuphold(posedge C1, CE, 0, 0, notifier);
+    $setuphold(posedge C0, R, 0, 0, notifier);
+    $setuphold(posedge C1, R, 0, 0, notifier);
+    $setuphold(posedge C0, S, 0, 0, notifier);
+    $setuphold(posedge C1, S, 0, 0, notifier);
+  endspecify
+endmodule

@@ -1,0 +1,48 @@
+// V_FDRSE: D flip-flop on the rising edge of C with clock enable CE,
+// synchronous reset R and synchronous set S. R takes precedence over S, and
+// both act whatever CE is. While the global set/reset chipwide.GSR is 1 the
+// flop holds INIT.
+`timescale 1 ns/1 ps
+module V_FDRSE (C, CE, R, S, D, Q);
+  parameter [0:0] INIT = 1'b0;
+  parameter XON = "TRUE";
+  parameter MSGON = "TRUE";
+  input C, CE, R, S, D;
+  output Q;
+
+  wire gsr = chipwide.GSR;
+  reg q_out;
+  reg notifier;
+
+  initial q_out = INIT;
+
+  always @(posedge gsr) q_out <= INIT;
+  always @(posedge C) if (gsr !== 1'b1) q_out <= next(q_out, D);
+
+  always @(notifier) if (XON == "TRUE") q_out <= 1'bx;
+
+  assign Q = q_out;
+
+  // The state after a clock edge with data d; an unknown control makes it
+  // unknown.
+  function next;
+    input q, d;
+    if (R === 1'b1) next = 1'b0;
+    else if (R !== 1'b0) next = 1'bx;
+    else if (S === 1'b1) next = 1'b1;
+    else if (S !== 1'b0) next = 1'bx;
+    else if (CE === 1'b1) next = d;
+    else if (CE !== 1'b0 && q !== d) next = 1'bx;
+    else next = q;
+  endfunction
+
+  specify
+    (posedge C => (Q +: D)) = (0, 0);
+    $setuphold(posedge C, D, 0, 0, notifier);
+    $setuphold(posedge C, CE, 0, 0, notifier);
+    $setuphold(posedge C, R, 0, 0, notifier);
+    $setuphold(posedge C, S, 0, 0, notifier);
+    $width(posedge C, 0, 0, notifier);
+    $width(negedge C, 0, 0, notifier);
+  endspecify
+endmodule

@@ -1,0 +1,32 @@
+// V_LUT1: 1-input lookup table. O is bit {I0} of INIT.
+`timescale 1 ns/1 ps
+module V_LUT1 (I0, O);
+  parameter [1:0] INIT = 2'h0;
+  input I0;
+  output O;
+
+  assign O = lut(INIT, {I0});
+
+  // Selects input by input, so that an unknown input makes the output
+  // unknown only where the entries it chooses between differ.
+  function lut;
+    input [1:0] init;
+    input [0:0] s;
+    reg [1:0] t;
+    integer k;
+    begin
+      t = init;
+      for (k = 0; k < 1; k = k + 1) t[k] = choose(t[2 * k], t[2 * k + 1], s[0]);
+      lut = t[0];
+    end
+  endfunction
+
+  function choose;
+    input a, b, s;
+    choose = (s === 1'b0) ? a : (s === 1'b1) ? b : (a === b) ? a : 1'bx;
+  endfunction
+
+  specify
+    (I0 => O) = (0, 0);
+  endspecify
+endmodule

@@ -1,0 +1,34 @@
+// V_LUT2: 2-input lookup table. O is bit {I1, I0} of INIT.
+`timescale 1 ns/1 ps
+module V_LUT2 (I0, I1, O);
+  parameter [3:0] INIT = 4'h0;
+  input I0, I1;
+  output O;
+
+  assign O = lut(INIT, {I1, I0});
+
+  // Selects input by input, so that an unknown input makes the output
+  // unknown only where the entries it chooses between differ.
+  function lut;
+    input [3:0] init;
+    input [1:0] s;
+    reg [3:0] t;
+    integer k;
+    begin
+      t = init;
+      for (k = 0; k < 2; k = k + 1) t[k] = choose(t[2 * k], t[2 * k + 1], s[0]);
+      for (k = 0; k < 1; k = k + 1) t[k] = choose(t[2 * k], t[2 * k + 1], s[1]);
+      lut = t[0];
+    end
+  endfunction
+
+  function choose;
+    input a, b, s;
+    choose = (s === 1'b0) ? a : (s === 1'b1) ? b : (a === b) ? a : 1'bx;
+  endfunction
+
+  specify
+    (I0 => O) = (0, 0);
+    (I1 => O) = (0, 0);
+  endspecify
+endmodule

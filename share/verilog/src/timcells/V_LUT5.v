@@ -1,0 +1,40 @@
+// V_LUT5: 5-input lookup table. O is bit {I4, I3, I2, I1, I0} of INIT.
+`timescale 1 ns/1 ps
+module V_LUT5 (I0, I1, I2, I3, I4, O);
+  parameter [31:0] INIT = 32'h00000000;
+  input I0, I1, I2, I3, I4;
+  output O;
+
+  assign O = lut(INIT, {I4, I3, I2, I1, I0});
+
+  // Selects input by input, so that an unknown input makes the output
+  // unknown only where the entries it chooses between differ.
+  function lut;
+    input [31:0] init;
+    input [4:0] s;
+    reg [31:0] t;
+    integer k;
+    begin
+      t = init;
+      for (k = 0; k < 16; k = k + 1) t[k] = choose(t[2 * k], t[2 * k + 1], s[0]);
+      for (k = 0; k < 8; k = k + 1) t[k] = choose(t[2 * k], t[2 * k + 1], s[1]);
+      for (k = 0; k < 4; k = k + 1) t[k] = choose(t[2 * k], t[2 * k + 1], s[2]);
+      for (k = 0; k < 2; k = k + 1) t[k] = choose(t[2 * k], t[2 * k + 1], s[3]);
+      for (k = 0; k < 1; k = k + 1) t[k] = choose(t[2 * k], t[2 * k + 1], s[4]);
+      lut = t[0];
+    end
+  endfunction
+
+  function choose;
+    input a, b, s;
+    choose = (s === 1'b0) ? a : (s === 1'b1) ? b : (a === b) ? a : 1'bx;
+  endfunction
+
+  specify
+    (I0 => O) = (0, 0);
+    (I1 => O) = (0, 0);
+    (I2 => O) = (0, 0);
+    (I3 => O) = (0, 0);
+    (I4 => O) = (0, 0);
+  endspecify
+endmodule

@@ -1,0 +1,68 @@
+#!/usr/bin/env bash
+# The programs' exit codes, help texts, default file names and failure
+# handling, seen from the command line.
+set -uo pipefail
+src=${NLW_SRC:-$(cd "$(dirname "$0")/../.." && pwd)}
+bin=${NLW_BIN:-$src/build}
+work=$(mktemp -d)
+trap 'rm -rf "$work"' EXIT
+fail=0
+
+expect() {  # description expected-code command...
+    local what=$1 want=$2; shift 2
+    "$@" >"$work/out.txt" 2>"$work/err.txt"
+    local got=$?
+    if [ "$got" = "$want" ]; then echo "ok   $what"; else
+        echo "FAIL $what: exit $got, expected $want"; cat "$work/out.txt" "$work/err.txt" | head -20; fail=1
+    fi
+}
+contains() {  # description file text
+    if grep -qF -- "$3" "$2"; then echo "ok   $1"; else echo "FAIL $1: '$3' not in output"; head -20 "$2"; fail=1; fi
+}
+
+cat > "$work/rtl.v" <<'V'
+module leaf(input a, input b, output y); assign y = a ^ b; endmodule
+module top(input [1:0] d, output y, output z);
+  leaf u(.a(d[0]), .b(d[1]), .y(y));
+  assign z = ~d[0];
+endmodule
+V
+yosys -q -p "read_verilog $work/rtl.v; synth -top top; write_json $work/top.json"
+
+expect "qdb2ver -h exits 0" 0 "$bin/qdb2ver" -h
+contains "qdb2ver -h prints the option lines" "$work/out.txt" "-aka                Write Also-Know-As names as comments."
+expect "tessel -h exits 0" 0 "$bin/tessel" -h
+contains "tessel -h prints the overview" "$work/out.txt" "Valid netlist_types are:"
+expect "no input file: usage, exit 2" 2 "$bin/qdb2ver"
+contains "usage names the synopsis" "$work/err.txt" "qdb2ver [-10ps] [-aka]"
+expect "unknown option: exit 2" 2 "$bin/qdb2ver" -nonsense "$work/top.json"
+expect "missing option value: exit 2" 2 "$bin/tessel" "$work/top.json" -ecn
+expect "missing design file: exit 2" 2 "$bin/qdb2ver" "$work/none.json"
+contains "the message names the file" "$work/err.txt" "none.json"
+printf '{"modules": {"top": {"ports": ' > "$work/bad.json"
+expect "malformed design file: exit 2" 2 "$bin/qdb2ver" "$work/bad.json"
+contains "the message names the file" "$work/err.txt" "bad.json"
+[ -e "$work/bad.v" ] && { echo "FAIL a netlist appeared for a bad design"; fail=1; }
+
+expect "a good design: exit 0" 0 "$bin/qdb2ver" "$work/top.json"
+[ -s "$work/top.v.netlist" ] || true
+if [ -s "$work/top.v" ] && grep -q "^ *module top" "$work/top.v"; then echo "ok   default output is the input root with .v"; else echo "FAIL default output file"; fail=1; fi
+cp "$work/top.v" "$work/keep.v"
+expect "existing output without -w: exit 1" 1 "$bin/qdb2ver" "$work/top.json"
+if cmp -s "$work/top.v" "$work/keep.v"; then echo "ok   the existing file is kept"; else echo "FAIL the existing file changed"; fail=1; fi
+expect "existing output with -w: exit 0" 0 "$bin/qdb2ver" -w "$work/top.json"
+expect "unwritable directory: exit 1" 1 "$bin/qdb2ver" "$work/top.json" "$work/no/such/dir/x.v"
+expect "options without data warn but work" 0 "$bin/tessel" -sim -gp GSR -w "$work/top.json" "$work/t.v"
+contains "the warning names the option" "$work/err.txt" "-gp"
+
+expect "flattened netlist: exit 0" 0 "$bin/qdb2ver" -fn -w "$work/top.json" "$work/flat.v"
+if grep -q "module leaf" "$work/flat.v"; then echo "FAIL -fn kept the sub-module"; fail=1; else echo "ok   -fn leaves one module"; fi
+datdir=${YOSYS_DATDIR:-/usr/share/yosys}
+for f in top flat; do
+    expect "iverilog reads $f.v" 0 iverilog -g2005 -o "$work/a.out" -s top "$work/$f.v" "$datdir/simcells.v"
+    expect "yosys reads $f.v" 0 yosys -q -p "read_verilog $work/$f.v; hierarchy -top top"
+done
+
+expect "-tm renames the top module" 0 "$bin/qdb2ver" -w -tm chip "$work/top.json" "$work/chip.v"
+contains "the module is named chip" "$work/chip.v" "module chip"
+exit $fail

@@ -1,0 +1,128 @@
+// Identifier escaping, bus range and index text, reserved words.
+#include <gtest/gtest.h>
+
+#include <string>
+#include <vector>
+
+#include "Nlw_NlBuilder.h"
+#include "Nlw_Verilog.h"
+
+namespace {
+
+// Names are split by the output style while a design is written.
+class VerilogText : public ::testing::Test {
+protected:
+    void SetUp() override { Nlw_NlBus::SetInputDelimiterType(4); }
+    Nlw_Verilog nlw;
+};
+
+TEST_F(VerilogText, EscapesExactlyTheNamesThatAreNoSimpleIdentifiers) {
+    struct Case {
+        const char* name;
+        bool isBused;
+        const char* expected;
+    };
+    const std::vector<Case> cases = {
+        {"abc", false, "abc"},
+        {"_x$1", false, "_x$1"},
+        {"a-b", false, "\\a-b "},
+        {"1abc", false, "\\1abc "},
+        {"$x", false, "\\$x "},
+        {"caf\xc3\xa9", false, "\\caf\xc3\xa9 "},
+        {"", false, ""},
+        {"module", false, "module"},
+        {"data[7]", false, "\\data[7] "},
+        {"data[7]", true, "data[7]"},
+        {"a-b[3]", true, "\\a-b [3]"},
+        {"a-b[", true, "\\a-b[ "},
+    };
+    for (const Case& c : cases)
+        EXPECT_STREQ(nlw.Escape(c.name, c.isBused), c.expected) << c.name << " " << c.isBused;
+}
+
+TEST_F(VerilogText, EscapedNamesComeBackAsTheCallersPointer) {
+    for (const char* name : {"\\a-b ", "\\a b [3]"}) {
+        EXPECT_EQ(nlw.Escape(name, 0), name);
+        EXPECT_EQ(nlw.Escape(name, 1), name);
+    }
+    EXPECT_STREQ(nlw.Escape(nlw.Escape("x y", 0), 0), "\\x y ");
+}
+
+TEST_F(VerilogText, ConsecutiveResultsShareOneBuffer) {
+    const char* first = nlw.Escape("a-b", 0);
+    EXPECT_EQ(nlw.Escape("c-d", 0), first);
+    EXPECT_STREQ(first, "\\c-d ");
+}
+
+TEST_F(VerilogText, LongNamesSurviveWhole) {
+    const std::string plain(5000, 'n');
+    EXPECT_EQ(nlw.Escape(plain.c_str(), 0), plain);
+    const std::string bit = std::string(4000, 'c') + "-[12]";
+    EXPECT_EQ(nlw.Escape(bit.c_str(), 1), "\\" + std::string(4000, 'c') + "- [12]");
+}
+
+TEST_F(VerilogText, RecognisesEscapedForms) {
+    for (const char* name : {"\\a-b ", "\\a b [3]", "\\ ", "\\a [3] "})
+        EXPECT_TRUE(nlw.IsEscaped(name)) << name;
+    for (const char* name : {"a-b", "\\a-b", "a b ", "", "\\a[3]", "\\a b [3"})
+        EXPECT_FALSE(nlw.IsEscaped(name)) << name;
+}
+
+// Marks its own escaped form and index text: Escape must ask through the
+// virtual operations.
+class MarkedVerilog : public Nlw_Verilog {
+public:
+    unsigned char IsEscaped(const char* name) override {
+        return std::string(name) == "keep me" || Nlw_Verilog::IsEscaped(name);
+    }
+    const char* GetIndexesString(DARRAY_Util_INT32*) override { return "<i>"; }
+};
+
+TEST_F(VerilogText, EscapeAsksThroughTheVirtualOperations) {
+    MarkedVerilog marked;
+    const char* keep = "keep me";
+    EXPECT_EQ(marked.Escape(keep, 0), keep);
+    EXPECT_STREQ(marked.Escape("a-b[3]", 1), "\\a-b <i>");
+}
+
+TEST_F(VerilogText, WritesBusRangesInTheBusOrder) {
+    Nlw_NlView view;
+    Nlw_NlBuilder builder(&view);
+    Nlw_NlBlock* top = builder.CreateRoot(builder.AddModuleType("top"), "top");
+    Nlw_NlBus* bus = builder.AddSignalBus(top, "d", 7, 0);
+    const char* first = nlw.GetRangeString(bus);
+    EXPECT_STREQ(first, "[7 : 0]");
+    for (int order : {1, 5}) {
+        bus->SetOrder(0, order);
+        EXPECT_STREQ(nlw.GetRangeString(bus), "[0 : 7]");
+    }
+    EXPECT_EQ(nlw.GetRangeString(builder.AddSignalBus(top, "s", 3, -2)), first);
+    EXPECT_STREQ(first, "[3 : -2]");
+}
+
+TEST_F(VerilogText, WritesBusIndexes) {
+    DARRAY_Util_INT32 indexes;
+    indexes.Add(-1);
+    const char* first = nlw.GetIndexesString(&indexes);
+    EXPECT_STREQ(first, "[-1]");
+    indexes[0] = 3;
+    EXPECT_STREQ(nlw.GetIndexesString(&indexes), "[3]");
+    // An empty array leaves the previous text.
+    DARRAY_Util_INT32 empty;
+    EXPECT_EQ(nlw.GetIndexesString(&empty), first);
+    EXPECT_STREQ(first, "[3]");
+}
+
+TEST(VerilogReservedWords, ListsTheKeywordsInOrder) {
+    Nlw_Verilog nlw;
+    std::vector<std::string> all;
+    for (const char** w = nlw.GetReservedWords(); *w != nullptr; ++w) all.push_back(*w);
+    ASSERT_EQ(all.size(), 103u);
+    EXPECT_EQ(all[0], "always");
+    EXPECT_EQ(all[44], "module");
+    EXPECT_EQ(all[102], "xor");
+    // The table is in alphabetical order; a swapped or misspelt word shows.
+    for (size_t i = 1; i < all.size(); ++i) EXPECT_LT(all[i - 1], all[i]) << all[i];
+}
+
+}  // namespace

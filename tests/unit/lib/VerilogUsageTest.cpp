@@ -1,0 +1,159 @@
+// Usage texts: the synopses the constructors store and the two help printers.
+#include <gtest/gtest.h>
+
+#include <cstdio>
+#include <string>
+#include <vector>
+
+#include "Nlw_Verilog.h"
+
+namespace {
+
+const char* const kQdb2ver =
+    "qdb2ver [-10ps] [-aka] [-cd] [-fn] [-gp <port_name>] [-ism] [-log <log_file>] [-ne] [-pf] "
+    "[-quiet] [-r] [-sdf_path [<path>]] [-shm] [-tf] [-ti <top_instance_name>] [-tm "
+    "<top_module_name>] [-tp <port_name>] [-ul] [-verbose] [-w] [--ub] <infile> [<outfile[.v]>]";
+
+const char* const kTessel =
+    "tessel [-ecn <tool_name>] [-sim] [-sta] [-ofmt verilog] [-aka] [-bx <BRAM_output_dir>] {-bd "
+    "<BRAM_data_file>[tag <tagName>]} [-dir <dir_name>] [-fn] [-gp <port_name>] [-intstyle "
+    "qde|qflow|silent] [-ism] [-insert_chipwide <true_or_false>] [-insert_pp_buffers "
+    "<true_or_false>][-ne] [-qdm <qdm_file>] [-mhf] [-module] [-qcf <qcf_file>] [-pf] [-s "
+    "<speed>][-sdf_anno <true_or_false>] [-sdf_path [<path>]] [-shm] [-tb] [-ti "
+    "<top_instance_name>][-tm <top_module_name>] [-tp <port_name>] [-ul] [-vcd] [-w] [--10ps] "
+    "[--cd] [--log <log_file>][--quiet] [--r] [--verbose] [--debug] [--cleanup] [--suh "
+    "<true_or_false>] [--wraplog <log_file>] [--ub] <infile> [<outfile[.v]>]";
+
+TEST(VerilogUsage, ConstructorsStoreNameSynopsisAndExtension) {
+    Nlw_Verilog qdb2ver;
+    EXPECT_STREQ(qdb2ver.GetApplicationName(), "qdb2ver");
+    EXPECT_STREQ(qdb2ver.GetUsage(), kQdb2ver);
+    EXPECT_STREQ(qdb2ver.GetFileExtension(), "v");
+
+    static const char name[] = "tessel";
+    Nlw_Verilog tessel(name);
+    EXPECT_EQ(tessel.GetApplicationName(), name);
+    EXPECT_STREQ(tessel.GetUsage(), kTessel);
+    EXPECT_STREQ(tessel.GetFileExtension(), "v");
+
+    Nlw_Verilog assigned;
+    assigned = tessel;
+    EXPECT_STREQ(assigned.GetUsage(), kTessel);
+}
+
+TEST(VerilogUsage, ConstructorsSetTheBusStyles) {
+    Nlw_NlBus::SetMultiDimensions(true);
+    Nlw_NlBus::SetInputDelimiterType(4);
+    Nlw_NlBus::SetOutputDelimiterType(7);
+    Nlw_Verilog nlw("tessel");
+    EXPECT_FALSE(Nlw_NlBus::GetMultiDimensions());
+    EXPECT_EQ(Nlw_NlBus::GetInputDelimiterType(), 7);
+    EXPECT_EQ(Nlw_NlBus::GetOutputDelimiterType(), 4);
+}
+
+struct HelpCase {
+    const char* appName;
+    bool isQdb2ver;
+};
+
+TEST(VerilogUsage, GetHelpChoosesThePrinterByApplicationName) {
+    const std::vector<HelpCase> cases = {
+        {"qdb2ver", true},   {"QDB2VER", true}, {"Qdb2Ver", true}, {"tessel", false},
+        {"qdb2ver2", false}, {"qdb2", false},   {"", false},
+    };
+    for (const HelpCase& c : cases) {
+        Nlw_Verilog nlw(c.appName);
+        const Nlw_NetlistWriter::HelpFunction expected =
+            c.isQdb2ver ? &Nlw_Verilog::Help : &Nlw_Verilog::TesselHelp;
+        EXPECT_EQ(nlw.GetHelp(), expected) << c.appName;
+    }
+    Nlw_Verilog byDefault;
+    EXPECT_EQ(byDefault.GetHelp(), &Nlw_Verilog::Help);
+}
+
+TEST(VerilogUsage, HelpIssuesTheOptionListLineByLine) {
+    const std::vector<std::string> expected = {
+        "\n",
+        "   -10ps               Set time precision to be 10 ps (the default is 1 ps).\n",
+        "   -aka                Write Also-Know-As names as comments.\n",
+        "   -cd                 Write `celldefine/`endcelldefine (Cadence only).\n",
+        "   -gp port_name       Bring out global reset/set net as port.\n",
+        "   -insert_chipwide true|false   insert chipwide module into netlist\n",
+        "   -fn                 Flatten verilog netlist.\n",
+        "   -ism                Include timcell modules in verilog file.\n",
+        "   -log log_file       Name the log file.\n",
+        "   -ne                 Do not escape names.\n",
+        "   -pf                 Generate pin file (Cadence only).\n",
+        "   -quiet              Reduce the screen output.\n",
+        "   -r                  Retain hierarchy in verilog file.\n",
+        "   -sdf_path [path]    Full path to sdf file used in $sdf_annotate.\n",
+        "   -shm                Write $shm* statements in testfixture (Cadence only).\n",
+        "   -tf                 Generate testfixture file.\n",
+        "   -ti top_inst_name   Name top-level testbench instance as desired.\n",
+        "   -tm top_module_name Name top-level module as desired.\n",
+        "   -tp port_name       Bring out global tristate net as port.\n",
+        "   -ul                 Include `uselib in verilog file (Cadence only).\n",
+        "   -verbose            Display processing messages in verbose mode.\n",
+        "   -w                  Overwrite the output file.\n",
+        "   <infile>            Input file: '.qdb', or '.qda'. (the '.qdb' extension\n",
+        "                       must be specified if the input is an '.qdb' file.)\n",
+        "   <outfile>           Output file name (default is '<infile>.v')\n\n",
+        "qdb2ver translates an QDB file (QDBBUILD output) or an QDA file (QDBANNO output) into "
+        "an Verilog netlist which is defined in terms of Vornix Simulation Primitives "
+        "(Timcells). The netlist should be used with supported simulation, static timing "
+        "analysis and formal verification software tools. Non-simulatable components (such as "
+        "boundary scan) are omitted. When the input is QDA, a SDF (Standard Delay Format) file "
+        "containing timing information in accordance with Vornix Timcells specification will "
+        "be generated.\n\n",
+    };
+    Port_MsgCapture capture;
+    Nlw_Verilog::Help();
+    ASSERT_EQ(capture.msgs.size(), 26u);
+    EXPECT_EQ(capture.msgs[0].domain, "NetListWriters");
+    EXPECT_EQ(capture.Texts(Port_MsgLevel::Status), expected);
+
+    // Explanations start in column 24, the -insert_chipwide line aside.
+    for (size_t i = 1; i <= 24; ++i) {
+        const std::string& line = capture.msgs[i].text;
+        if (line.find("-insert_chipwide") != std::string::npos) continue;
+        ASSERT_GT(line.size(), 24u) << line;
+        EXPECT_EQ(line[22], ' ') << line;
+        EXPECT_NE(line[23], ' ') << line;
+    }
+}
+
+const std::vector<std::string> kTesselLines = {
+    "\n",
+    "Use \"tessel -h <netlist_type>\" to display netlist-specific options. \n",
+    "Valid netlist_types are: \n\n",
+    "    equivalence or ecn (display options for equivalence checking netlist)\n",
+    "    simulation  or sim (display options for simulation netlist)\n",
+    "    static      or sta (display options for static timing analysis netlist)\n\n",
+    "tessel extracts design data from the input file and generates netlist compatible with "
+    "supported equivalence checking, simulation or static timing analysis tools.\n\n",
+};
+
+// Tells on stderr when the status lines issued so far are the overview, so
+// that the dying process can be judged by its output.
+class OverviewSink : public Port_MsgSink {
+public:
+    void Receive(const Port_Msg& msg) override {
+        if (msg.level == Port_MsgLevel::Status) lines_.push_back(msg.text);
+        if (lines_ == kTesselLines) std::fputs("[overview complete]", stderr);
+    }
+
+private:
+    std::vector<std::string> lines_;
+};
+
+void RunTesselHelp() {
+    static OverviewSink sink;
+    Port_MsgManager::Instance().AddSink(&sink);
+    Nlw_Verilog::TesselHelp();
+}
+
+TEST(VerilogUsageDeathTest, TesselHelpIssuesTheOverviewAndExits) {
+    EXPECT_EXIT(RunTesselHelp(), ::testing::ExitedWithCode(0), "\\[overview complete\\]");
+}
+
+}  // namespace

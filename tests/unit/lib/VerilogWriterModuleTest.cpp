@@ -1,0 +1,141 @@
+// Module traversal and the layout of one module definition.
+#include "VerilogWriterTest.h"
+
+namespace {
+
+using vwtest::AfterHead;
+
+class VerilogWriterModules : public vwtest::WriterTest {
+protected:
+    VerilogWriterModules() { params_.SetInsert_chipwide(false); }
+
+    // top holds a1 (type A, port x), b1 (type B) and a2 (type A, port z), in
+    // this order, so the macro list is top, a1, b1, a2.
+    void BuildThreeMacros() {
+        top_ = b_.CreateRoot(b_.AddModuleType("top"), "top");
+        Nlw_NlType* a = b_.AddModuleType("A");
+        Nlw_NlBlock* a1 = b_.CreateMacro(top_, a, "a1");
+        b_.AddPort(a1, "x", NLW_DIR_INPUT);
+        b_.CreateMacro(top_, b_.AddModuleType("B"), "b1");
+        a2_ = b_.CreateMacro(top_, a, "a2");
+        b_.AddPort(a2_, "z", NLW_DIR_INPUT);
+    }
+
+    Nlw_NlBlock* top_ = nullptr;
+    Nlw_NlBlock* a2_ = nullptr;
+};
+
+TEST_F(VerilogWriterModules, WritesEachTypeOnceInReverseMacroOrder) {
+    BuildThreeMacros();
+    // A comes from a2, the later of the two macros of that type.
+    EXPECT_EQ(AfterHead(View()), R"(module A (
+  z
+);
+  input z;
+endmodule
+
+module B (
+);
+endmodule
+
+module top (
+);
+  A   a1 (
+  );
+  B   b1 (
+  );
+  A   a2 (
+  );
+endmodule
+
+)");
+}
+
+TEST_F(VerilogWriterModules, CellDefineWrapsModuleOneLevelDeeper) {
+    BuildThreeMacros();
+    params_.SetWriteCellDefine(true);
+    EXPECT_EQ(Module(a2_), R"(`celldefine
+  module A (
+    z
+  );
+    input z;
+  endmodule
+`endcelldefine
+
+)");
+}
+
+TEST_F(VerilogWriterModules, UseLibDirectiveEndsFileAfterChipwide) {
+    BuildThreeMacros();
+    params_.SetWriteUseLib(true);
+    params_.SetInsert_chipwide(true);
+    root_.Dir("verilog/src/timcells");
+    root_.File("verilog/src/chipwide.v", "module chipwide;\nendmodule\n");
+    const std::string text = View();
+    const std::string tail = R"(endmodule
+
+
+`ifndef CHIPWIDE
+`define CHIPWIDE
+module chipwide;
+endmodule
+
+`endif
+
+`uselib
+)";
+    ASSERT_GE(text.size(), tail.size());
+    EXPECT_EQ(text.substr(text.size() - tail.size()), tail);
+}
+
+TEST_F(VerilogWriterModules, MultipleHierarchyModeWritesOnlyThePreambleFromView) {
+    BuildThreeMacros();
+    params_.SetMHFMode(true);
+    const std::string text = View();
+    EXPECT_NE(text.find("`timescale 1 ns/1 ps\n\n"), std::string::npos);
+    EXPECT_EQ(AfterHead(text), "");
+}
+
+TEST_F(VerilogWriterModules, ModuleFileHasHeadModuleAndClosingUseLib) {
+    BuildThreeMacros();
+    params_.SetWriteUseLib(true);
+    root_.Dir("verilog/src/timcells");
+    auto writer = MakeWriter();
+    writer->WriteMHBlock(a2_);
+    const std::string text = writer->GetMemoryText();
+    EXPECT_NE(text.find("// Module Name: A\n"), std::string::npos);
+    EXPECT_EQ(AfterHead(text), "module A (\n  z\n);\n  input z;\nendmodule\n\n`uselib\n");
+}
+
+TEST_F(VerilogWriterModules, BlackBoxModeHidesTheBodyFromSynthesis) {
+    BuildThreeMacros();
+    nlw_.SetIsVornixCore(true);
+    params_.SetFuncellMode(true);
+    EXPECT_EQ(Module(a2_),
+              "module A (\n"
+              "  z\n"
+              ")/* synthesis syn_black_box syn_noprune=1 */;\n"
+              "  input z;\n"
+              "  \n"
+              "  // synthesis translate_off\n"
+              "  \n"
+              "\n"
+              "// synthesis translate_on\n"
+              "\n"
+              "endmodule\n"
+              "\n");
+    // Either flag alone writes a plain module.
+    nlw_.SetIsVornixCore(false);
+    EXPECT_EQ(Module(a2_), "module A (\n  z\n);\n  input z;\nendmodule\n\n");
+}
+
+TEST_F(VerilogWriterModules, AkaCommentFollowsTheOpeningParenthesis) {
+    BuildThreeMacros();
+    a2_->SetAka("orig/a2\nnext");
+    EXPECT_EQ(Module(a2_).substr(0, 11), "module A (\n");
+    params_.SetWriteAka(true);
+    // A line break in the name must not end the comment early.
+    EXPECT_EQ(Module(a2_).substr(0, 33), "module A ( // AKA:orig/a2 next\n  ");
+}
+
+}  // namespace

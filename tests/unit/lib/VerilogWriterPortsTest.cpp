@@ -1,0 +1,173 @@
+// Port lists and declarations, wire declarations and the assign statement.
+#include "VerilogWriterTest.h"
+
+namespace {
+
+class VerilogWriterPorts : public vwtest::WriterTest {
+protected:
+    Nlw_NlBlock* Root(const char* name = "m") {
+        return b_.CreateRoot(b_.AddModuleType(name), name);
+    }
+};
+
+TEST_F(VerilogWriterPorts, ScalarsComeBeforeBusesWhateverThePinOrder) {
+    Nlw_NlBlock* m = Root();
+    b_.AddPort(m, "a", NLW_DIR_INPUT);
+    b_.AddPortBus(m, "d", NLW_DIR_INPUT, 3, 0);
+    b_.AddPort(m, "y", NLW_DIR_OUTPUT);
+    b_.AddPortBus(m, "q", NLW_DIR_INOUT, 0, 1);
+    b_.AddPort(m, "e-1", NLW_DIR_INOUT);
+    b_.SetVisible(b_.AddPort(m, "hidden", NLW_DIR_INPUT), false);
+    b_.SetValid(b_.AddPortBus(m, "bad", NLW_DIR_INPUT, 1, 0), false);
+    EXPECT_EQ(Module(m), R"(module m (
+  a, y, \e-1 , d, q
+);
+  input a;
+  output y;
+  inout \e-1 ;
+  input [3 : 0] d;
+  inout [0 : 1] q;
+endmodule
+
+)");
+}
+
+TEST_F(VerilogWriterPorts, UntypedPortIsListedButNotDeclared) {
+    Nlw_NlBlock* m = Root();
+    Nlw_NlPin* u = b_.AddPort(m, "u", NLW_DIR_UNTYPED);
+    b_.AddPort(m, "a", NLW_DIR_INPUT);
+    Nlw_NlPinBus* ub = b_.AddPortBus(m, "ub", NLW_DIR_UNTYPED, 1, 0);
+    Port_MsgCapture capture;
+    EXPECT_EQ(Module(m), "module m (\n  u, a, ub\n);\n  input a;\nendmodule\n\n");
+    EXPECT_EQ(
+        capture.Texts(Port_MsgLevel::Internal),
+        (std::vector<std::string>{"Nlw_VerilogWriter: Notype " + u->ToString() + " detected.\n",
+                                  "Nlw_VerilogWriter: Notype " + ub->ToString() + " detected.\n"}));
+}
+
+TEST_F(VerilogWriterPorts, ModuleWithoutPortsHasNoPortLine) {
+    EXPECT_EQ(Module(Root()), "module m (\n);\nendmodule\n\n");
+}
+
+TEST_F(VerilogWriterPorts, BusOnlyPortListBeginsWithIndentation) {
+    Nlw_NlBlock* m = Root();
+    b_.AddPortBus(m, "d", NLW_DIR_OUTPUT, 1, 0);
+    EXPECT_EQ(Module(m), "module m (\n  d\n);\n  output [1 : 0] d;\nendmodule\n\n");
+}
+
+TEST_F(VerilogWriterPorts, AkaCommentsOnlyWhenAsked) {
+    Nlw_NlBlock* m = Root();
+    b_.AddPort(m, "a", NLW_DIR_INPUT)->SetAka("A_orig");
+    b_.AddPortBus(m, "d", NLW_DIR_INPUT, 1, 0)->SetAka("D_orig");
+    b_.AddSignal(m, "n")->SetAka("N_orig");
+    const std::string plain = Module(m);
+    EXPECT_EQ(plain.find("AKA"), std::string::npos);
+    params_.SetWriteAka(true);
+    EXPECT_EQ(Module(m), R"(module m (
+  a, d
+);
+  input a; // AKA:A_orig
+  input [1 : 0] d; // AKA:D_orig
+  wire n; // AKA:N_orig
+endmodule
+
+)");
+}
+
+TEST_F(VerilogWriterPorts, WiresListScalarsBeforeBuses) {
+    Nlw_NlBlock* m = Root();
+    b_.AddSignal(m, "n1");
+    b_.AddSignalBus(m, "bus", 3, 0);
+    b_.SetVisible(b_.AddSignal(m, "hidden"), false);
+    b_.AddSignal(m, "n-2");
+    b_.SetValid(b_.AddSignalBus(m, "bad", 1, 0), false);
+    Nlw_NlBus* sb = b_.AddSignalBus(m, "sb", 1, 0);
+    b_.GetSignalBusMember(sb, 1);  // a member is declared with its bus only
+    EXPECT_EQ(Module(m), R"(module m (
+);
+  wire n1;
+  wire \n-2 ;
+  wire [3 : 0] bus;
+  wire [1 : 0] sb;
+endmodule
+
+)");
+}
+
+TEST_F(VerilogWriterPorts, AssignJoinsPortsToDifferentlyNamedNets) {
+    Nlw_NlBlock* m = Root();
+    Nlw_NlType* drv = b_.AddLibraryType("DRV", true, false);
+    b_.AddTypePin(drv, "O", NLW_DIR_OUTPUT);
+    // Ports that are neither inputs nor outputs need a driver on their net;
+    // those without one take no part, first or last.
+    struct PortCase {
+        const char* name;
+        int dir;
+        const char* net;
+        bool driven;
+    };
+    const PortCase ports[] = {
+        {"u1", NLW_DIR_UNTYPED, "n_u1", false}, {"a", NLW_DIR_INPUT, "net_a", false},
+        {"y", NLW_DIR_OUTPUT, "net_y", false},  {"u2", NLW_DIR_UNTYPED, "n_u2", true},
+        {"io", NLW_DIR_INOUT, "n_io", false},   {"s", NLW_DIR_INPUT, "s", false},
+        {"u3", NLW_DIR_UNTYPED, "n_u3", false},
+    };
+    for (const PortCase& p : ports) b_.AddPort(m, p.name, p.dir);
+    for (const PortCase& p : ports) {
+        Nlw_NlSignal* net = b_.AddSignal(m, p.net);
+        b_.ConnectChild(m->FindPin(p.name), net);
+        if (p.driven) b_.Connect(b_.CreateLeaf(m, drv, "u")->FindPin("O"), net);
+    }
+    Port_MsgCapture capture;  // the untyped ports are reported
+    const std::string text = Module(m);
+    // The host counts an inout port as a driver of its own net.
+    const std::string expected = R"(  assign
+    net_a = a,
+    y = net_y,
+    u2 = n_u2,
+    io = n_io;
+)";
+    EXPECT_NE(text.find("  wire n_u3;\n" + expected + "  DRV   u ("), std::string::npos) << text;
+}
+
+TEST_F(VerilogWriterPorts, NoAssignWhenEveryPortMatchesItsNet) {
+    Nlw_NlBlock* m = Root();
+    Nlw_NlPin* a = b_.AddPort(m, "a", NLW_DIR_INPUT);
+    Nlw_NlPin* io = b_.AddPort(m, "io", NLW_DIR_INOUT);
+    b_.ConnectChild(a, b_.AddSignal(m, "a"));
+    b_.ConnectChild(io, b_.AddSignal(m, "io"));
+    EXPECT_EQ(Module(m), R"(module m (
+  a, io
+);
+  input a;
+  inout io;
+  wire a;
+  wire io;
+endmodule
+
+)");
+}
+
+TEST_F(VerilogWriterPorts, GlobalSignalIsWrittenUnescaped) {
+    Nlw_NlBlock* m = Root();
+    Nlw_NlPin* in = b_.AddPort(m, "gsr", NLW_DIR_INPUT);
+    Nlw_NlPin* out = b_.AddPort(m, "o", NLW_DIR_OUTPUT);
+    Nlw_NlSignal* gsr = b_.AddSignal(m, "glbl.GSR");
+    gsr->AddProperty(Vdm_Property::NewBool("NLW_GLOBAL_SIGNAL", true));
+    b_.ConnectChild(in, gsr);
+    b_.ConnectChild(out, b_.AddSignal(m, "n.o"));
+    const std::string text = Module(m);
+    EXPECT_NE(text.find("  assign\n    glbl.GSR = gsr,\n    o = \\n.o ;\n"), std::string::npos)
+        << text;
+}
+
+TEST_F(VerilogWriterPorts, BusBitsKeepTheirIndexOutsideTheEscape) {
+    Nlw_NlBlock* m = Root();
+    b_.AddPortBus(m, "d", NLW_DIR_INPUT, 1, 0);
+    Nlw_NlBus* inner = b_.AddSignalBus(m, "n-x", 1, 0);
+    b_.ConnectChild(m->GetPinByAlias("d[1]"), b_.GetSignalBusMember(inner, 1));
+    const std::string text = Module(m);
+    EXPECT_NE(text.find("  assign\n    \\n-x [1] = d[1];\n"), std::string::npos) << text;
+}
+
+}  // namespace

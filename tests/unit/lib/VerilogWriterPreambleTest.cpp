@@ -1,0 +1,223 @@
+// File heads, the library search and the timing annotation statement.
+#include "VerilogWriterTest.h"
+
+namespace {
+
+using vwtest::ScopedEnv;
+using vwtest::TempDir;
+
+const char* const kNoVornix =
+    " The VORNIX environment variable must be set for this program towork. Please check your "
+    "environment to ensure that it is setup properly to use the Vornix tools\n";
+const char* const kNoLibrary =
+    "Timcell library directory not found, the `uselib constructis omitted for the -ul option.\n";
+
+class VerilogWriterPreamble : public vwtest::WriterTest {
+protected:
+    VerilogWriterPreamble() {
+        top_ = b_.CreateRoot(b_.AddModuleType("top"), "top");
+        params_.SetInsert_chipwide(false);
+        params_.SetCommandLine("qdb2ver -w top.qdb");
+        params_.SetInputFileName("top.qdb");
+        params_.SetVornix("/opt/vornix");
+        b_.SetDevice("vx100 fg256 -5", "vx100-fg256-5");
+    }
+    // The lines of the head from the purpose label to the time scale.
+    std::string Purpose() {
+        const std::string text = View();
+        const size_t begin = text.find("// Purpose:");
+        return text.substr(begin, text.find("`timescale") - begin);
+    }
+
+    Nlw_NlBlock* top_ = nullptr;
+};
+
+TEST_F(VerilogWriterPreamble, SingleFileHead) {
+    EXPECT_EQ(View(),
+              "////////////////////////////////////////////////////////////////////////////////\n"
+              "// Copyright (c) Vornix. All rights reserved.\n"
+              "////////////////////////////////////////////////////////////////////////////////\n"
+              "//\n"
+              "//       | |\n"
+              "//    +------+    Vendor: Vornix\n"
+              "//  --|      |--  Version: 0.1\n"
+              "//  --|  VX  |--  Application: qdb2ver\n"
+              "//  --|      |--  Filename: top.v\n"
+              "//    +------+    Timestamp: Thu Jan  1 00:00:00 2026\n"
+              "//       | |\n"
+              "//\n"
+              "//             \n"
+              "// Command\t: qdb2ver -w top.qdb\n"
+              "// Device\t: vx100 fg256 -5\n"
+              "// Input file\t: top.qdb\n"
+              "// Output file\t: top.v\n"
+              "// # of Modules\t: 1\n"
+              "// Design Name\t: demo\n"
+              "// Vornix        : /opt/vornix\n"
+              "//             \n"
+              "// Purpose:    \n"
+              "//     This verilog netlist is a verification model and uses simulation \n"
+              "//     primitives which may not represent the true implementation of the \n"
+              "//     device, however the netlist is functionally correct and should not \n"
+              "//     be modified. This file cannot be synthesized and should only be used \n"
+              "//     with supported simulation tools.\n"
+              "//             \n"
+              "// Reference:  \n"
+              "//     Vornix Netlist Writer User Guide and Vornix Simulation Library Guide\n"
+              "//             \n"
+              "////////////////////////////////////////////////////////////////////////////////\n"
+              "\n"
+              "`timescale 1 ns/1 ps\n"
+              "\n"
+              "module top (\n"
+              ");\n"
+              "endmodule\n"
+              "\n");
+}
+
+TEST_F(VerilogWriterPreamble, ModuleFileNamesItsModule) {
+    Nlw_NlBlock* sub = b_.CreateMacro(top_, b_.AddModuleType("sub"), "s1");
+    auto writer = MakeWriter();
+    writer->WriteMHBlock(sub);
+    const std::string text = writer->GetMemoryText();
+    EXPECT_NE(text.find("//  --|      |--  Filename: sub.v\n"), std::string::npos);
+    EXPECT_NE(text.find("// Design Name\t: demo\n// Module Name: sub\n// Vornix  "),
+              std::string::npos);
+    EXPECT_EQ(View().find("Module Name"), std::string::npos);
+}
+
+TEST_F(VerilogWriterPreamble, PurposeTextsFollowTheModesInFixedOrder) {
+    params_.SetSimMode(false);
+    params_.SetStaMode(true);
+    params_.SetEcnMode(true);
+    params_.SetWritePsTimePrecision(false);
+    EXPECT_EQ(Purpose(),
+              "// Purpose:    \n"
+              "//     This verilog netlist is a verification model and uses library \n"
+              "//     primitives which may not represent the true implementation of \n"
+              "//     the device, however the netlist is functionally correct and \n"
+              "//     should not be modified. This file cannot be synthesized and \n"
+              "//     should only be used with supported equivalence checking tools.\n"
+              "//     This verilog netlist is a verification model and uses library \n"
+              "//     primitives which may not represent the true implementation of \n"
+              "//     the device, however the netlist is functionally correct and \n"
+              "//     should not be modified. This file cannot be synthesized and \n"
+              "//     should only be used with supported static timing analysis tools.\n"
+              "//             \n"
+              "// Reference:  \n"
+              "//     Vornix Netlist Writer User Guide\n"
+              "//             \n"
+              "////////////////////////////////////////////////////////////////////////////////\n"
+              "\n");
+    EXPECT_NE(View().find("\n`timescale 1 ns/10 ps\n\n"), std::string::npos);
+}
+
+TEST_F(VerilogWriterPreamble, LibrarySearchTakesTheFirstRootHoldingTheDirectory) {
+    params_.SetWriteUseLib(true);
+    TempDir r1, r2, r3;
+    const std::string plainFile = r1.File("plain", "x");
+    r2.Dir("verilog/src/timcells");
+    r2.Dir("verilog/src/funcells");
+    r3.Dir("verilog/src/timcells");
+    struct Case {
+        std::string roots;
+        bool funcell;
+        std::string line;  // empty: none found
+    };
+    const Case cases[] = {
+        {plainFile + ":/no/such/dir:" + r1.Path() + ":" + r2.Path() + ":" + r3.Path(), false,
+         "`uselib dir=" + r2.Path() + "/verilog/src/timcells libext=.v\n"},
+        {r3.Path() + ":" + r2.Path(), true,
+         "`uselib dir=" + r2.Path() + "/verilog/src/funcells libext=.v\n"},
+        {r1.Path(), false, ""},
+    };
+    for (const Case& c : cases) {
+        vornix_.Set(c.roots.c_str());
+        params_.SetFuncellMode(c.funcell);
+        Port_MsgCapture capture;
+        const std::string text = View();
+        EXPECT_NE(text.find("`timescale 1 ns/1 ps\n" + c.line + "\nmodule top"), std::string::npos)
+            << c.roots;
+        EXPECT_EQ(capture.Texts(Port_MsgLevel::Error), c.line.empty()
+                                                           ? std::vector<std::string>{kNoLibrary}
+                                                           : std::vector<std::string>{});
+    }
+}
+
+TEST_F(VerilogWriterPreamble, LibrarySearchWithoutRootsGivesBothErrors) {
+    params_.SetWriteUseLib(true);
+    vornix_.Set("");
+    Port_MsgCapture capture;
+    EXPECT_NE(View().find("`timescale 1 ns/1 ps\n\nmodule top"), std::string::npos);
+    EXPECT_EQ(capture.Texts(Port_MsgLevel::Error),
+              (std::vector<std::string>{kNoVornix, kNoLibrary}));
+}
+
+TEST_F(VerilogWriterPreamble, SdfAnnotateNeedsPropertyOptionAndEnvironment) {
+    struct Case {
+        bool annotated, option, disabled;
+        const char* sdfPath;
+        const char* statement;  // null: none
+    };
+    const Case cases[] = {
+        {true, true, false, "out", "  initial $sdf_annotate(\"out/top.sdf\");\n"},
+        {true, true, false, nullptr, "  initial $sdf_annotate(\"top.sdf\");\n"},
+        {true, true, false, "a\"b\\c\nd", "  initial $sdf_annotate(\"a\\\"b/c\\nd/top.sdf\");\n"},
+        {false, true, false, "out", nullptr},
+        {true, false, false, "out", nullptr},
+        {true, true, true, "out", nullptr},
+    };
+    for (const Case& c : cases) {
+        if (c.annotated)
+            top_->AddProperty(Vdm_Property::NewBool("NLW_SDFANNOTATED", true));
+        else
+            top_->RemoveProperty("NLW_SDFANNOTATED");
+        params_.SetSdfAnnotate(c.option);
+        params_.SetSdfPath(c.sdfPath);
+        ScopedEnv disable("VOR_SIMMODEL_DISABLE_SDF_ANNOTATE", c.disabled ? "" : nullptr);
+        EXPECT_EQ(Module(top_), std::string("module top (\n);\n") +
+                                    (c.statement ? c.statement : "") + "endmodule\n\n");
+    }
+}
+
+TEST_F(VerilogWriterPreamble, ShortModuleFileHead) {
+    params_.SetWriteUseLib(true);
+    params_.SetFuncellMode(true);  // the short head always looks for timcells
+    root_.Dir("verilog/src/timcells");
+    auto writer = MakeWriter();
+    writer->WriteMHHeader(top_);
+    EXPECT_EQ(writer->GetMemoryText(),
+              "// Vornix Verilog netlist produced by qdb2ver application (version 0.1)\n"
+              "// This netlist is one of multiple netlists created for the\n"
+              "// design using tessel's write multiple hierarchy files option.\n"
+              "\n"
+              "// Design name : demo\n"
+              "// Module name : top\n"
+              "\n"
+              "// This verilog netlist is a simulation model and uses simulation \n"
+              "// primitives which may not represent the true implementation of the \n"
+              "// device, however the netlist is functionally correct and should not \n"
+              "// be modified. This file cannot be synthesized and should only be used \n"
+              "// with supported simulation tools.\n"
+              "\n"
+              "`timescale 1 ns/1 ps\n"
+              "`uselib dir=" +
+                  root_.Path() + "/verilog/src/timcells libext=.v\n\n");
+
+    params_.SetWriteUseLib(false);
+    params_.SetStaMode(true);
+    writer = MakeWriter();
+    writer->WriteMHHeader(top_);
+    EXPECT_NE(writer->GetMemoryText().find(
+                  "// should not be modified. This file cannot be synthesized and \n"
+                  "// should only be used with supported static timing analysis tools. \n\n"),
+              std::string::npos);
+    params_.SetEcnMode(true);
+    writer = MakeWriter();
+    writer->WriteMHHeader(top_);
+    EXPECT_NE(writer->GetMemoryText().find(
+                  "// should only be used with supported equivalence checking tools. \n\n"),
+              std::string::npos);
+}
+
+}  // namespace

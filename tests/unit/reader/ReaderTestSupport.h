@@ -1,0 +1,204 @@
+// Helpers of the design reader tests: loading JSON text or files, a private
+// installation with chosen data files, running yosys, and model lookups.
+#pragma once
+
+#include <gtest/gtest.h>
+#include <stdlib.h>
+#include <unistd.h>
+
+#include <cstdlib>
+#include <fstream>
+#include <memory>
+#include <sstream>
+#include <string>
+#include <vector>
+
+#include "Nlw_JsonReader.h"
+#include "Nlw_Nl.h"
+#include "Port.h"
+
+namespace readertest {
+
+class TempDir {
+public:
+    TempDir() {
+        char tmpl[] = "/tmp/nlw_reader_test_XXXXXX";
+        const char* made = ::mkdtemp(tmpl);
+        EXPECT_NE(made, nullptr);
+        path_ = made ? made : "/tmp";
+    }
+    ~TempDir() { std::system(("rm -rf '" + path_ + "'").c_str()); }
+    TempDir(const TempDir&) = delete;
+    TempDir& operator=(const TempDir&) = delete;
+    const std::string& path() const { return path_; }
+    std::string operator/(const std::string& name) const { return path_ + "/" + name; }
+
+private:
+    std::string path_;
+};
+
+inline void WriteFile(const std::string& path, const std::string& text) {
+    std::ofstream out(path, std::ios::binary);
+    out << text;
+}
+
+inline std::string ReadFile(const std::string& path) {
+    std::ifstream in(path, std::ios::binary);
+    std::stringstream ss;
+    ss << in.rdbuf();
+    return ss.str();
+}
+
+// An installation root of the test's own, with the data files given (a
+// name and its text each), made the only installation while it lives.
+struct DataFile {
+    std::string name, text;
+};
+using DataFiles = std::vector<DataFile>;
+
+class Installation {
+public:
+    explicit Installation(const DataFiles& files = {}) {
+        std::system(("mkdir -p '" + dir_.path() + "/data'").c_str());
+        for (const DataFile& f : files) WriteFile(dir_.path() + "/data/" + f.name, f.text);
+        const char* old = std::getenv("VORNIX");
+        hadOld_ = old != nullptr;
+        if (old) old_ = old;
+        ::setenv("VORNIX", dir_.path().c_str(), 1);
+        Port::VornixPath::Reset();
+    }
+    Installation(const Installation&) = delete;
+    Installation& operator=(const Installation&) = delete;
+    ~Installation() {
+        if (hadOld_)
+            ::setenv("VORNIX", old_.c_str(), 1);
+        else
+            ::unsetenv("VORNIX");
+        Port::VornixPath::Reset();
+    }
+    const std::string& path() const { return dir_.path(); }
+
+private:
+    TempDir dir_;
+    std::string old_;
+    bool hadOld_ = false;
+};
+
+// A small library of cells the tests know by heart.
+inline const char* TestCells() {
+    return "cell LUT2 timcell\n"
+           "pin I0 input\n"
+           "pin I1 input\n"
+           "pin O output\n"
+           "cell FD timcell\n"
+           "pin C input\n"
+           "pin D input\n"
+           "pin Q output\n"
+           "cell RAM funcell\n"
+           "bus A input 3 0\n"
+           "bus DO output 0 7\n"
+           "pin CLK input\n"
+           "cell IPAD timcell pad\n"
+           "pin PAD output pad\n"
+           "cell OPAD timcell pad\n"
+           "pin PAD input pad\n";
+}
+
+// A loaded design with the messages the load gave.
+struct Loaded {
+    std::unique_ptr<Nlw_NlView> view = std::make_unique<Nlw_NlView>();
+    std::unique_ptr<Nlw_Design> design;
+    bool ok = false;
+    std::vector<std::string> errors, warnings;
+
+    Nlw_NlBlock* root() const { return view->GetRootMacro(); }
+};
+
+inline Loaded LoadText(const std::string& json, Nlw_ReadOptions options = {},
+                       const char* name = "test.json") {
+    Loaded l;
+    Port_MsgCapture capture;
+    l.ok = Nlw_JsonReader::LoadText(json, name, options, *l.view, l.design);
+    l.errors = capture.Texts(Port_MsgLevel::Error);
+    l.warnings = capture.Texts(Port_MsgLevel::Warning);
+    return l;
+}
+
+inline Loaded LoadFile(const std::string& path, Nlw_ReadOptions options = {}) {
+    Loaded l;
+    Port_MsgCapture capture;
+    l.ok = Nlw_JsonReader::Load(path.c_str(), options, *l.view, l.design);
+    l.errors = capture.Texts(Port_MsgLevel::Error);
+    l.warnings = capture.Texts(Port_MsgLevel::Warning);
+    return l;
+}
+
+inline bool HaveYosys() {
+    static const int status = std::system("yosys -V >/dev/null 2>&1");
+    return status == 0;
+}
+
+// Synthesizes Verilog with yosys into a netlist JSON file in dir; script is
+// the yosys commands run between reading and writing.
+inline std::string Synthesize(const TempDir& dir, const std::string& verilog,
+                              const std::string& script) {
+    WriteFile(dir / "design.v", verilog);
+    std::string json = dir / "design.json";
+    std::string cmd = "cd '" + dir.path() + "' && yosys -q -p 'read_verilog design.v; " + script +
+                      "; write_json design.json' > yosys.log 2>&1";
+    EXPECT_EQ(std::system(cmd.c_str()), 0) << ReadFile(dir / "yosys.log");
+    return json;
+}
+
+// Lookups by writable name; linear, for tests only.
+inline Nlw_NlBlock* Child(const Nlw_NlBlock* parent, const std::string& name) {
+    for (Nlw_NlBlock* c : parent->GetChildren())
+        if (name == c->GetInstanceName()) return c;
+    return nullptr;
+}
+
+inline Nlw_NlSignal* Signal(const Nlw_NlBlock* macro, const std::string& name) {
+    for (Nlw_NlSignal* s : macro->GetSignals())
+        if (name == s->GetWritableName()) return s;
+    return nullptr;
+}
+
+inline Nlw_NlBus* SignalBus(const Nlw_NlBlock* macro, const std::string& name) {
+    if (const UT_DARRAY<Nlw_NlBus*>* buses = macro->GetSignalBuses())
+        for (Nlw_NlBus* b : *buses)
+            if (name == b->GetWritableName()) return b;
+    return nullptr;
+}
+
+inline Nlw_NlPinBus* PinBus(const Nlw_NlBlock* block, const std::string& name) {
+    if (const UT_DARRAY<Nlw_NlPinBus*>* buses = block->GetPinBuses())
+        for (Nlw_NlPinBus* b : *buses)
+            if (name == b->GetWritableName()) return b;
+    return nullptr;
+}
+
+// The name of the signal on a pin (outside), "" when none.
+inline std::string NetOf(const Nlw_NlBlock* block, const std::string& pin) {
+    Nlw_NlPin* p = block->GetPinByAlias(pin.c_str());
+    if (!p) return "<no pin " + pin + ">";
+    return p->GetSignal() ? p->GetSignal()->GetWritableName() : "";
+}
+
+// The name of a port's inside signal, "" when none.
+inline std::string InsideOf(const Nlw_NlBlock* macro, const std::string& port) {
+    Nlw_NlPin* p = macro->GetPinByAlias(port.c_str());
+    if (!p) return "<no port " + port + ">";
+    return p->GetChildSignal() ? p->GetChildSignal()->GetWritableName() : "";
+}
+
+inline int TieOf(const Nlw_NlBlock* block, const std::string& pin) {
+    Nlw_NlPin* p = block->GetPinByAlias(pin.c_str());
+    const Vdm_Property* t = p ? p->GetPropertyByName("TIEOFF") : nullptr;
+    return t ? t->GetInt32() : -1;
+}
+
+inline bool Contains(const std::string& text, const std::string& part) {
+    return text.find(part) != std::string::npos;
+}
+
+}  // namespace readertest
