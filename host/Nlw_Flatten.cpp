@@ -14,9 +14,9 @@ namespace {
 // One module instance of the flattened tree, in depth-first order.
 struct Inst {
     uint32_t module;
-    uint32_t base;     // its first net in the flat numbering
-    int32_t parent;    // index of the parent instance, -1 for the top
-    std::string_view name;  // the cell name in the parent
+    uint32_t base;   // its first net in the flat numbering
+    int32_t parent;  // index of the parent instance, -1 for the top
+    Text name;       // the cell name in the parent
 };
 
 class Flattener {
@@ -64,7 +64,7 @@ private:
     // Lists the instances depth-first and merges port nets with the parent's.
     void Enumerate() {
         uint64_t total = d_.modules[d_.top].numNets;
-        insts_.push_back({d_.top, 0, -1, {}});
+        insts_.push_back({d_.top, 0, -1, ""});
         std::vector<std::pair<uint32_t, uint32_t>> stack{{0, 0}};  // instance, next cell
         while (!stack.empty()) {
             auto [ii, next] = stack.back();
@@ -87,8 +87,8 @@ private:
         uf_.resize(total);
         for (uint32_t k = 0; k < total; ++k) uf_[k] = k;
         const_.assign(total, 0);
-        for (size_t k = 0; k < links_.size(); ++k) Link(insts_[links_[k].first],
-                                                        insts_[k + 1], links_[k].second);
+        for (size_t k = 0; k < links_.size(); ++k)
+            Link(insts_[links_[k].first], insts_[k + 1], links_[k].second);
     }
 
     void Link(const Inst& parent, const Inst& child, uint32_t cellIndex) {
@@ -168,12 +168,12 @@ private:
                     if (!bus) {
                         const NetBus& nb = m.buses[size_t(nn.bus)];
                         bus = b_.AddSignalBus(root, Named(nb.name), nb.msb, nb.lsb);
-                        if (!nb.aka.empty()) bus->SetAka(nb.aka.data());
+                        if (*nb.aka) bus->SetAka(nb.aka);
                     }
                     s = b_.GetSignalBusMember(bus, nn.index);
                 } else {
                     s = b_.AddSignal(root, Named(nn.name));
-                    if (!nn.aka.empty()) s->SetAka(nn.aka.data());
+                    if (*nn.aka) s->SetAka(nn.aka);
                 }
                 signal_[r] = s;
             }
@@ -191,7 +191,7 @@ private:
                     uint32_t r = Find(uint32_t(ref));
                     if (!const_[r]) {
                         b_.ConnectChild(root->GetPin(p.BitPos(i)), signal_[r]);
-                        if (!p.pinName.empty()) topPinName_.emplace(r, p.pinName);
+                        if (*p.pinName) topPinName_.emplace(r, p.pinName);
                         continue;
                     }
                     ref = const_[r];
@@ -215,16 +215,17 @@ private:
             };
             for (const Cell& c : m.cells) {
                 if (c.macro) continue;
-                const LibType& lt = d_.types[c.type];
-                std::string_view padName;
-                if (lt.pad && c.pinName.empty()) {
+                const LibVariant& v = d_.variants[c.type];
+                const LibType& lt = d_.types[v.base];
+                Text padName = "";
+                if (lt.pad && !*m.ExtraOf(c).pinName) {
                     int32_t ref = PadPinRef(m, c, lt);
                     if (ref >= 0) {
                         auto it = topPinName_.find(Find(in.base + uint32_t(ref)));
                         if (it != topPinName_.end()) padName = it->second;
                     }
                 }
-                CreateLeafCell(b_, m, c, lt, root, Named(c.name), padName, net);
+                CreateLeafCell(b_, m, c, v, lt, root, Named(c.name), padName, net);
             }
         }
     }
@@ -239,7 +240,7 @@ private:
     std::vector<int8_t> const_;  // per merged net: the constant it is tied to, or 0
     std::vector<int32_t> best_;
     std::vector<Nlw_NlSignal*> signal_;
-    std::unordered_map<uint32_t, std::string_view> topPinName_;
+    std::unordered_map<uint32_t, Text> topPinName_;
     Nlw_NlSignal* consts_[4] = {nullptr, nullptr, nullptr, nullptr};
     std::string path_, name_;
     std::vector<std::pair<int32_t, size_t>> pathStack_;
@@ -247,6 +248,8 @@ private:
 
 }  // namespace
 
-void BuildFlat(Design& d, Nlw_NlView& view) { Flattener(d, view).Run(); }
+void BuildFlat(Design& d, Nlw_NlView& view) {
+    Flattener(d, view).Run();
+}
 
 }  // namespace nlw_json

@@ -19,7 +19,8 @@ class Nlw_JsonReader {
 public:
     // Loads the file into the (empty) view and sets the design (named after
     // the top module). On failure issues one error naming the file and the
-    // fault, and returns false.
+    // fault, and returns false; every fault of the input is found before the
+    // view is touched.
     static bool Load(const char* fileName, const Nlw_ReadOptions& options, Nlw_NlView& view,
                      std::unique_ptr<Nlw_Design>& design);
     // The same from text in memory; fileName names it in messages.

@@ -1,5 +1,6 @@
 // Model building shared by the unfolding and the flattening builder: the top
 // block, ports, properties, constant port bits and global signals.
+#include <algorithm>
 #include <cstring>
 #include <string>
 
@@ -12,38 +13,38 @@ namespace {
 const char* const kParamCount = "NLW_PARAM_COUNT";
 
 Vdm_Property* MakeProperty(const Param& p) {
-    const char* name = p.name.data();
-    switch (p.value.kind) {
+    switch (p.kind) {
         case ValueKind::Bits:
-            return Vdm_Property::NewBits(name, p.value.text.data());
+            return Vdm_Property::NewBits(p.name, p.text);
         case ValueKind::Int:
-            return Vdm_Property::NewInt(name, static_cast<int32_t>(p.value.i));
+            return Vdm_Property::NewInt(p.name, static_cast<int32_t>(p.i));
         case ValueKind::Float:
-            return Vdm_Property::NewFloat(name, p.value.d);
+            return Vdm_Property::NewFloat(p.name, p.d);
         case ValueKind::Bool:
-            return Vdm_Property::NewBool(name, p.value.i != 0);
+            return Vdm_Property::NewBool(p.name, p.i != 0);
         case ValueKind::String:
             break;
     }
-    return Vdm_Property::NewString(name, p.value.text.data());
+    return Vdm_Property::NewString(p.name, p.text);
 }
 
 }  // namespace
 
-void AddBlockProperties(const Module& m, const Cell& c, const LibType* lt,
-                        std::string_view padPinName, Nlw_NlBlock* block) {
+void AddBlockProperties(const Module& m, const Cell& c, const LibType* lt, Text padPinName,
+                        Nlw_NlBlock* block) {
     for (uint32_t k = 0; k < c.paramCount; ++k)
         block->AddProperty(MakeProperty(m.params[c.paramFirst + k]));
-    std::string_view pinName = c.pinName;
-    if (pinName.empty() && lt && lt->pad) pinName = padPinName;
+    if (c.extra == kNone && !(lt && lt->pad)) return;
+    const CellExtra& x = m.ExtraOf(c);
+    Text pinName = *x.pinName || !lt || !lt->pad ? x.pinName : padPinName;
     bool extra = false;
     // A parameter of the same name stays; the attribute does not replace it.
-    if (!pinName.empty() && !block->GetPropertyByName("PINNAME")) {
-        block->AddProperty(Vdm_Property::NewString("PINNAME", pinName.data()));
+    if (*pinName && !block->GetPropertyByName("PINNAME")) {
+        block->AddProperty(Vdm_Property::NewString("PINNAME", pinName));
         extra = true;
     }
-    if (!c.typeAttr.empty() && !block->GetPropertyByName("TYPE")) {
-        block->AddProperty(Vdm_Property::NewString("TYPE", c.typeAttr.data()));
+    if (*x.typeAttr && !block->GetPropertyByName("TYPE")) {
+        block->AddProperty(Vdm_Property::NewString("TYPE", x.typeAttr));
         extra = true;
     }
     if (extra) block->AddProperty(Vdm_Property::NewInt(kParamCount, int32_t(c.paramCount)));
@@ -53,26 +54,25 @@ int32_t PadPinRef(const Module& m, const Cell& c, const LibType& lt) {
     if (!lt.pad || lt.padPin < 0) return kConstX;
     for (uint32_t k = 0; k < c.connCount; ++k) {
         const Conn& cn = m.conns[c.connFirst + k];
-        if (cn.slot == static_cast<uint32_t>(lt.padPin) && cn.width > 0)
-            return m.refs[cn.bitFirst];
+        if (cn.slot == static_cast<uint32_t>(lt.padPin) && cn.width > 0) return m.refs[cn.bitFirst];
     }
     return kConstX;
 }
 
 Nlw_NlType* ModuleType(Module& m, Nlw_NlBuilder& b) {
-    if (!m.nlType) m.nlType = b.AddModuleType(m.name.data());
+    if (!m.nlType) m.nlType = b.AddModuleType(m.nameText);
     return m.nlType;
 }
 
 Nlw_NlBlock* CreateTop(Design& d, Nlw_NlBuilder& b) {
     CreateLibTypes(d, b);
     Module& top = d.modules[d.top];
-    if (!top.part.empty()) {
+    if (*top.part) {
         // A part name reads device-package-speed.
         std::string part(top.part);
         b.SetDevice(part.substr(0, part.find('-')).c_str(), part.c_str());
     }
-    Nlw_NlBlock* root = b.CreateRoot(ModuleType(top, b), top.name.data());
+    Nlw_NlBlock* root = b.CreateRoot(ModuleType(top, b), top.nameText);
     AddPorts(b, top, root);
     return root;
 }
@@ -82,9 +82,9 @@ void AddPorts(Nlw_NlBuilder& b, const Module& m, Nlw_NlBlock* block) {
     for (const Port& p : m.ports) {
         if (p.width == 0) continue;
         if (p.IsBus())
-            b.AddPortBus(block, p.name.data(), p.dir, p.msb, p.lsb);
+            b.AddPortBus(block, p.name, p.dir, p.msb, p.lsb);
         else
-            b.AddPort(block, p.name.data(), p.dir);
+            b.AddPort(block, p.name, p.dir);
     }
 }
 

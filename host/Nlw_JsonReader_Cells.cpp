@@ -1,5 +1,6 @@
 // Reading the cells of a module: their types, parameters, the attributes the
 // reader uses, and their connections checked against the pins of their types.
+#include <cstring>
 #include <string>
 
 #include "Nlw_JsonReader_Internal.h"
@@ -22,155 +23,222 @@ int DirectionOf(object dirs, bool haveDirs, std::string_view pin) {
 }
 
 // A pin a connection or a direction names that the type's definition does
-// not have: the type's pins are the union of all of them.
-uint32_t AddPin(LibType& lt, std::string_view name, int dir, uint32_t width) {
+// not have: the type's pins are the union of all of them, and each instance
+// gives such a pin its own width.
+uint32_t AddPin(LibType& lt, std::string_view name, int dir, TextPool& pool) {
     LibType::Pin p;
-    p.name = name;
+    p.name = pool.Keep(name);
     p.dir = dir;
-    p.width = width ? width : 1;
-    p.bus = width > 1;
-    p.msb = static_cast<int32_t>(p.width) - 1;
     uint32_t idx = static_cast<uint32_t>(lt.pins.size());
     lt.pins.push_back(p);
-    lt.pinIndex.emplace(name, idx);
+    lt.pinIndex.emplace(p.name, idx);
+    lt.flexible = true;
     return idx;
 }
 
-uint32_t LeafSlot(Design& d, uint32_t type, std::string_view pin, uint32_t width, object dirs,
-                  bool haveDirs, const Where& where) {
-    LibType& lt = d.types[type];
-    auto it = lt.pinIndex.find(pin);
-    if (it == lt.pinIndex.end()) return AddPin(lt, pin, DirectionOf(dirs, haveDirs, pin), width);
-    LibType::Pin& p = lt.pins[it->second];
-    if (p.dir == NLW_DIR_UNTYPED) p.dir = DirectionOf(dirs, haveDirs, pin);
-    if (width > p.width) {
-        if (p.fixedRange)
-            Fail(where.Text() + ": " + std::to_string(width) + " bits, but pin '" +
-                 std::string(pin) + "' of cell type '" + std::string(lt.name) + "' has " +
-                 std::to_string(p.width));
-        p.width = width;
-        p.bus = true;
-        p.msb = static_cast<int32_t>(width) - 1;
-        p.lsb = 0;
+// The type's pin of a connection. Instances list their connections in the
+// same order as a rule, mostly the order of the type's pins, so the pin at
+// the connection's position is tried before the index.
+uint32_t LeafSlot(Design& d, LibType& lt, uint32_t position, std::string_view pin, uint32_t width,
+                  object dirs, bool haveDirs, const Where& where) {
+    uint32_t idx;
+    if (position < lt.pins.size() && pin == lt.pins[position].name) {
+        idx = position;
+    } else {
+        auto it = lt.pinIndex.find(pin);
+        if (it == lt.pinIndex.end())
+            return AddPin(lt, pin, DirectionOf(dirs, haveDirs, pin), d.pool);
+        idx = it->second;
     }
-    return it->second;
+    LibType::Pin& p = lt.pins[idx];
+    if (p.dir == NLW_DIR_UNTYPED) p.dir = DirectionOf(dirs, haveDirs, pin);
+    if (p.fixedRange && width > p.width)
+        Fail(where.Text() + ": " + std::to_string(width) + " bits, but pin '" + std::string(pin) +
+             "' of cell type '" + lt.name + "' has " + std::to_string(p.width));
+    return idx;
 }
 
-uint32_t MacroSlot(const Module& child, std::string_view pin, uint32_t width,
+uint32_t MacroSlot(const Module& child, uint32_t position, std::string_view pin, uint32_t width,
                    const Where& where) {
-    auto it = child.portIndex.find(pin);
-    if (it == child.portIndex.end())
-        Fail(where.Text() + ": module '" + std::string(child.name) + "' has no port '" +
-             std::string(pin) + "'");
-    const Port& p = child.ports[it->second];
+    uint32_t idx;
+    if (position < child.ports.size() && pin == child.ports[position].name) {
+        idx = position;
+    } else {
+        auto it = child.portIndex.find(pin);
+        if (it == child.portIndex.end())
+            Fail(where.Text() + ": module '" + std::string(child.name) + "' has no port '" +
+                 std::string(pin) + "'");
+        idx = it->second;
+    }
+    const Port& p = child.ports[idx];
     if (width > p.width)
         Fail(where.Text() + ": " + std::to_string(width) + " bits, but port '" + std::string(pin) +
              "' of module '" + std::string(child.name) + "' has " + std::to_string(p.width));
-    return it->second;
+    return idx;
 }
 
-void ReadCellAttrs(object co, Module& m, Cell& c, const Where& where, bool pad) {
-    object attrs;
-    element e;
-    if (co.at_key("attributes").get(e)) return;
-    if (e.get_object().get(attrs)) Fail(where.Text() + ": expected an object for \"attributes\"");
+object ObjectOf(element e, const Where& where, const char* key) {
+    object o;
+    if (e.get_object().get(o))
+        Fail(where.Text() + ": expected an object for \"" + std::string(key) + "\"");
+    return o;
+}
+
+void ReadCellAttrs(object attrs, TextPool& pool, CellExtra& x, const Where& where, bool pad) {
     std::string_view loc;
     for (auto kv : attrs) {
         std::string_view k = kv.key;
         if (k == "hdlname") {
-            std::string_view t = ValueText(ReadValue(kv.value, m, where), m);
-            std::string path(t);
-            for (char& ch : path)
-                if (ch == ' ') ch = '/';
-            c.aka = m.Keep(std::move(path));
+            x.aka = JoinPath(ValueText(ReadValue(kv.value, pool, where), pool), pool);
         } else if (k == "PINNAME") {
-            c.pinName = ValueText(ReadValue(kv.value, m, where), m);
+            x.pinName = pool.Keep(ValueText(ReadValue(kv.value, pool, where), pool));
         } else if (k == "LOC") {
-            loc = ValueText(ReadValue(kv.value, m, where), m);
+            loc = ValueText(ReadValue(kv.value, pool, where), pool);
         } else if (k == "TYPE") {
-            c.typeAttr = ValueText(ReadValue(kv.value, m, where), m);
+            x.typeAttr = pool.Keep(ValueText(ReadValue(kv.value, pool, where), pool));
         }
     }
     // "LOC" stands for the package pin only on a pad.
-    if (c.pinName.empty() && pad) c.pinName = loc;
+    if (!*x.pinName && pad && !loc.empty()) x.pinName = pool.Keep(loc);
+}
+
+// The cell's type: a module of the file, or a library type. Runs of cells
+// of one type are common, so the last answer is kept.
+struct TypeCache {
+    std::string last;
+    bool macro = false;
+    uint32_t type = 0;
+};
+
+void ResolveType(Design& d, std::string_view name, TypeCache& cache, Cell& c) {
+    if (!cache.last.empty() && name == cache.last) {
+        c.macro = cache.macro;
+        c.type = cache.type;
+        return;
+    }
+    auto mit = d.moduleIndex.find(name);
+    if (mit != d.moduleIndex.end() && !d.modules[mit->second].blackbox) {
+        c.macro = true;
+        c.type = mit->second;
+    } else {
+        c.macro = false;
+        c.type = FindOrAddLibType(d, name);
+    }
+    cache.last.assign(name);
+    cache.macro = c.macro;
+    cache.type = c.type;
 }
 
 }  // namespace
 
 void ReadCells(Design& d, Module& m, object cells) {
     Where where{m.name, {}, {}, {}};
+    TypeCache cache;
+    // Room for a typical cell's connections and parameters; what is left
+    // over is given back when the module is digested.
+    const size_t n = cells.size();
+    m.cells.reserve(m.cells.size() + n);
+    m.conns.reserve(m.conns.size() + 4 * n);
+    m.refs.reserve(m.refs.size() + 4 * n);
+    m.params.reserve(m.params.size() + n);
     for (auto kv : cells) {
         where.cell = kv.key;
         where.section = {};
         where.key = {};
         object co;
         if (kv.value.get_object().get(co)) Fail(where.Text() + ": expected an object");
-        Cell c;
-        c.name = kv.key;
-        if (co.at_key("type").get_string().get(c.typeName))
-            Fail(where.Text() + ": missing or bad \"type\"");
-        auto mit = d.moduleIndex.find(c.typeName);
-        if (mit != d.moduleIndex.end() && !d.modules[mit->second].blackbox) {
-            c.macro = true;
-            c.type = mit->second;
-        } else {
-            c.type = FindOrAddLibType(d, c.typeName);
+        // One walk over the cell's members; the connections wait for the
+        // type and the directions.
+        std::string_view typeName;
+        bool haveType = false, haveDirs = false, haveConns = false;
+        object params, attrs, dirs, conns;
+        bool haveParams = false, haveAttrs = false;
+        for (auto f : co) {
+            std::string_view k = f.key;
+            if (k == "type") {
+                haveType = !f.value.get_string().get(typeName);
+            } else if (k == "parameters") {
+                params = ObjectOf(f.value, where, "parameters");
+                haveParams = true;
+            } else if (k == "attributes") {
+                attrs = ObjectOf(f.value, where, "attributes");
+                haveAttrs = true;
+            } else if (k == "port_directions") {
+                dirs = ObjectOf(f.value, where, "port_directions");
+                haveDirs = true;
+            } else if (k == "connections") {
+                conns = ObjectOf(f.value, where, "connections");
+                haveConns = true;
+            }
         }
+        if (!haveType) Fail(where.Text() + ": missing or bad \"type\"");
+        Cell c;
+        c.name = d.pool.Keep(kv.key);
+        ResolveType(d, typeName, cache, c);
+        // A leaf's type is its library type until its layout is known.
+        const uint32_t base = c.type;
+        const bool pad = !c.macro && d.types[base].pad;
 
-        object params;
-        element e;
         c.paramFirst = static_cast<uint32_t>(m.params.size());
-        if (!co.at_key("parameters").get(e)) {
-            if (e.get_object().get(params))
-                Fail(where.Text() + ": expected an object for \"parameters\"");
+        if (haveParams) {
             where.section = "parameter";
             for (auto pv : params) {
                 where.key = pv.key;
-                m.params.push_back({pv.key, ReadValue(pv.value, m, where)});
+                Value v = ReadValue(pv.value, d.pool, where);
+                Param p;
+                p.name = d.pool.Keep(pv.key);
+                p.kind = v.kind;
+                p.text = v.kind == ValueKind::Bits || v.kind == ValueKind::String
+                             ? d.pool.Keep(v.text)
+                             : "";
+                p.i = v.i;
+                p.d = v.d;
+                m.params.push_back(p);
             }
             where.section = {};
             where.key = {};
         }
         c.paramCount = static_cast<uint32_t>(m.params.size()) - c.paramFirst;
-        ReadCellAttrs(co, m, c, where, !c.macro && d.types[c.type].pad);
-
-        object dirs;
-        bool haveDirs = false;
-        if (!co.at_key("port_directions").get(e)) {
-            if (e.get_object().get(dirs))
-                Fail(where.Text() + ": expected an object for \"port_directions\"");
-            haveDirs = true;
+        if (haveAttrs && attrs.size() > 0) {
+            CellExtra x;
+            ReadCellAttrs(attrs, d.pool, x, where, pad);
+            if (*x.aka || *x.pinName || *x.typeAttr) {
+                c.extra = static_cast<uint32_t>(m.extras.size());
+                m.extras.push_back(x);
+            }
         }
+
         c.connFirst = static_cast<uint32_t>(m.conns.size());
-        object conns;
-        if (!co.at_key("connections").get(e)) {
-            if (e.get_object().get(conns))
-                Fail(where.Text() + ": expected an object for \"connections\"");
+        if (haveConns) {
             where.section = "connection";
+            uint32_t position = 0;
             for (auto cv : conns) {
                 where.key = cv.key;
                 Conn cn;
                 cn.bitFirst = static_cast<uint32_t>(m.refs.size());
                 cn.width = ReadBits(cv.value, m, where);
-                cn.slot = c.macro ? MacroSlot(d.modules[c.type], cv.key, cn.width, where)
-                                  : LeafSlot(d, c.type, cv.key, cn.width, dirs, haveDirs, where);
+                cn.slot = c.macro ? MacroSlot(d.modules[c.type], position, cv.key, cn.width, where)
+                                  : LeafSlot(d, d.types[base], position, cv.key, cn.width, dirs,
+                                             haveDirs, where);
                 m.conns.push_back(cn);
+                ++position;
             }
             where.section = {};
             where.key = {};
         }
         c.connCount = static_cast<uint32_t>(m.conns.size()) - c.connFirst;
-        // A type the library does not define also takes the pins its
-        // instances declare without connecting them.
-        if (!c.macro && haveDirs) {
-            LibType& lt = d.types[c.type];
-            if (!lt.def && lt.blackbox < 0 && dirs.size() != c.connCount) {
+        if (!c.macro) {
+            // A type the library does not define also takes the pins its
+            // instances declare without connecting them.
+            LibType& lt = d.types[base];
+            if (haveDirs && !lt.def && lt.blackbox < 0 && dirs.size() != c.connCount) {
                 for (auto dv : dirs)
                     if (!lt.pinIndex.count(dv.key))
-                        AddPin(lt, dv.key, DirectionOf(dirs, true, dv.key), 1);
+                        AddPin(lt, dv.key, DirectionOf(dirs, true, dv.key), d.pool);
             }
+            c.type = FindOrAddVariant(d, base, m, c);
+            if (pad) m.ownPads = true;
         }
-        if (!c.macro && d.types[c.type].pad) m.ownPads = true;
         m.cells.push_back(c);
     }
 }

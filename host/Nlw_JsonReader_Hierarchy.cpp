@@ -81,8 +81,7 @@ uint32_t ChooseTop(const Design& d) {
              "; name the top module");
     if (unused.size() == 1) return unused[0];
     if (unused.empty()) Fail("no top module candidate: every module is a blackbox or instantiated");
-    Fail("several top module candidates: " + NameList(d, unused, ", ") +
-         "; name the top module");
+    Fail("several top module candidates: " + NameList(d, unused, ", ") + "; name the top module");
 }
 
 void LoadCellLibrary(Design& d) {

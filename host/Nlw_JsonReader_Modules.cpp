@@ -75,7 +75,9 @@ void ReadRange(object o, uint32_t width, const Where& where, int32_t& msb, int32
     lsb = static_cast<int32_t>(upto ? last : offset);
 }
 
-bool IsBitChar(char c) { return c == '0' || c == '1' || c == 'x' || c == 'z'; }
+bool IsBitChar(char c) {
+    return c == '0' || c == '1' || c == 'x' || c == 'z';
+}
 
 // Binary text of a number that does not fit an integer property.
 std::string BinaryText(uint64_t v, bool negative) {
@@ -91,43 +93,32 @@ std::string BinaryText(uint64_t v, bool negative) {
 }
 
 struct Attrs {
-    std::string_view aka, pinName, loc, global;
-    bool hasConn = false, hasFloat = false;
-    int64_t conn = 3, floatVal = 0;
+    Text aka = "", pinName = "";
+    std::string_view global;
+    int64_t setResetConn = 3, tristateConn = 3, floatVal = 0;
 };
 
-std::string_view JoinPath(std::string_view hdlname, Module& m) {
-    std::string t;
-    t.reserve(hdlname.size());
-    for (char c : hdlname) t += c == ' ' ? '/' : c;
-    return m.Keep(std::move(t));
-}
-
 // The attributes of a named net that the reader uses.
-Attrs ReadNetAttrs(object o, Module& m, const Where& where) {
+Attrs ReadNetAttrs(object o, TextPool& pool, const Where& where) {
     Attrs a;
     object attrs;
     if (!OptionalObject(o, "attributes", where, attrs)) return a;
     for (auto kv : attrs) {
         std::string_view k = kv.key;
         if (k == "hdlname") {
-            a.aka = JoinPath(ValueText(ReadValue(kv.value, m, where), m), m);
+            a.aka = JoinPath(ValueText(ReadValue(kv.value, pool, where), pool), pool);
         } else if (k == "PINNAME" || k == "LOC") {
-            std::string_view t = ValueText(ReadValue(kv.value, m, where), m);
-            if (k == "PINNAME" || a.pinName.empty()) a.pinName = t;
+            if (k == "PINNAME" || !*a.pinName)
+                a.pinName = pool.Keep(ValueText(ReadValue(kv.value, pool, where), pool));
         } else if (k == "NLW_GLOBAL") {
-            a.global = ValueText(ReadValue(kv.value, m, where), m);
+            a.global = ValueText(ReadValue(kv.value, pool, where), pool);
         } else if (k == "NLW_SETRESET_CONN" || k == "NLW_TRISTATE_CONN" || k == "VL_FLOATVAL") {
             int64_t v;
-            if (!ValueToInt(ReadValue(kv.value, m, where), v))
+            if (!ValueToInt(ReadValue(kv.value, pool, where), v))
                 Fail(where.Text() + ": attribute '" + std::string(k) + "' must be an integer");
-            if (k == "VL_FLOATVAL") {
-                a.floatVal = v;
-                a.hasFloat = true;
-            } else {
-                a.conn = v;
-                a.hasConn = true;
-            }
+            (k == "VL_FLOATVAL"         ? a.floatVal
+             : k == "NLW_SETRESET_CONN" ? a.setResetConn
+                                        : a.tristateConn) = v;
         }
     }
     return a;
@@ -141,34 +132,33 @@ void ReadPorts(Design& d, Module& m) {
         where.key = kv.key;
         object po = AsObject(kv.value, where, "a port");
         Port p;
-        p.name = kv.key;
+        p.name = d.pool.Keep(kv.key);
         element e;
         if (!po.at_key("direction").get(e)) p.dir = ReadDirection(e, where);
         if (po.at_key("bits").get(e)) Fail(where.Text() + ": missing \"bits\"");
         p.bitFirst = static_cast<uint32_t>(m.refs.size());
         p.width = ReadBits(e, m, where);
         ReadRange(po, p.width, where, p.msb, p.lsb);
-        if (!m.portIndex.emplace(p.name, static_cast<uint32_t>(m.ports.size())).second)
+        if (!m.portIndex.emplace(kv.key, static_cast<uint32_t>(m.ports.size())).second)
             Fail(where.Text() + ": given twice");
         p.pinPos = m.numPins;
         m.numPins += p.width;
         m.ports.push_back(p);
     }
-    (void)d;
 }
 
-void ReadModuleAttrs(Module& m) {
+void ReadModuleAttrs(Module& m, TextPool& pool) {
     Where where{m.name, {}, {}, {}};
     object attrs;
     if (!OptionalObject(m.json, "attributes", where, attrs)) return;
     for (auto kv : attrs) {
         std::string_view k = kv.key;
         if (k == "blackbox" || k == "whitebox") {
-            if (ValueIsTrue(ReadValue(kv.value, m, where))) m.blackbox = true;
+            if (ValueIsTrue(ReadValue(kv.value, pool, where))) m.blackbox = true;
         } else if (k == "top") {
-            m.topAttr = ValueIsTrue(ReadValue(kv.value, m, where));
+            m.topAttr = ValueIsTrue(ReadValue(kv.value, pool, where));
         } else if (k == "PART") {
-            m.part = ValueText(ReadValue(kv.value, m, where), m);
+            m.part = pool.Keep(ValueText(ReadValue(kv.value, pool, where), pool));
         }
     }
 }
@@ -178,6 +168,9 @@ void ReadChildren(Design& d, Module& m, uint32_t self, std::vector<uint32_t>& st
     Where where{m.name, {}, {}, {}};
     object cells;
     if (!OptionalObject(m.json, "cells", where, cells)) return;
+    // Runs of cells of one type are common: the last type is not looked up
+    // again.
+    std::string_view last;
     for (auto kv : cells) {
         where.cell = kv.key;
         object co = AsObject(kv.value, where, "a cell");
@@ -185,12 +178,19 @@ void ReadChildren(Design& d, Module& m, uint32_t self, std::vector<uint32_t>& st
         std::string_view type;
         if (co.at_key("type").get(t) || t.get_string().get(type))
             Fail(where.Text() + ": missing or bad \"type\"");
+        if (type == last) continue;
+        last = type;
         auto it = d.moduleIndex.find(type);
         if (it == d.moduleIndex.end() || d.modules[it->second].blackbox) continue;
         if (stamp[it->second] == self + 1) continue;
         stamp[it->second] = self + 1;
         m.children.push_back(it->second);
     }
+}
+
+template <typename T>
+void Trim(std::vector<T>& v) {
+    if (v.capacity() - v.size() > v.size() / 8 + 256) v.shrink_to_fit();
 }
 
 }  // namespace
@@ -224,16 +224,18 @@ uint32_t ReadBits(element e, Module& m, const Where& where) {
                 break;
             }
             default:
-                Fail(where.Text() + ": bad bit value (expected a net number or \"0\", \"1\", "
-                                    "\"x\", \"z\")");
+                Fail(where.Text() +
+                     ": bad bit value (expected a net number or \"0\", \"1\", "
+                     "\"x\", \"z\")");
         }
         m.refs.push_back(ref);
-        ++n;
+        // The model holds buses of up to 2^24 bits.
+        if (++n > (1u << 24)) Fail(where.Text() + ": more than 16777216 bits");
     }
     return n;
 }
 
-Value ReadValue(element e, Module& m, const Where& where) {
+Value ReadValue(element e, TextPool& pool, const Where& where) {
     Value v;
     switch (e.type()) {
         case element_type::STRING: {
@@ -248,7 +250,7 @@ Value ReadValue(element e, Module& m, const Where& where) {
                 v.kind = ValueKind::Bits;
                 v.text = s;
             } else if (k == s.size() && bitsEnd < s.size()) {
-                v.text = m.Keep(std::string(s.substr(0, s.size() - 1)));
+                v.text = pool.Keep(s.substr(0, s.size() - 1));
             } else {
                 v.text = s;
             }
@@ -259,14 +261,14 @@ Value ReadValue(element e, Module& m, const Where& where) {
             if (v.i < std::numeric_limits<int32_t>::min() ||
                 v.i > std::numeric_limits<int32_t>::max()) {
                 v.kind = ValueKind::Bits;
-                v.text = m.Keep(BinaryText(static_cast<uint64_t>(v.i), v.i < 0));
+                v.text = pool.Keep(BinaryText(static_cast<uint64_t>(v.i), v.i < 0));
             } else {
                 v.kind = ValueKind::Int;
             }
             return v;
         case element_type::UINT64:
             v.kind = ValueKind::Bits;
-            v.text = m.Keep(BinaryText(uint64_t(e), false));
+            v.text = pool.Keep(BinaryText(uint64_t(e), false));
             return v;
         case element_type::DOUBLE:
             v.kind = ValueKind::Float;
@@ -281,22 +283,28 @@ Value ReadValue(element e, Module& m, const Where& where) {
     }
 }
 
-std::string_view ValueText(const Value& v, Module& m) {
+Text JoinPath(std::string_view hdlname, TextPool& pool) {
+    std::string t(hdlname);
+    std::replace(t.begin(), t.end(), ' ', '/');
+    return pool.Keep(t);
+}
+
+std::string_view ValueText(const Value& v, TextPool& pool) {
     switch (v.kind) {
         case ValueKind::String:
             return v.text;
         case ValueKind::Bits: {
             int64_t n;
-            if (v.text.size() <= 63 && ValueToInt(v, n)) return m.Keep(std::to_string(n));
+            if (v.text.size() <= 63 && ValueToInt(v, n)) return pool.Keep(std::to_string(n));
             return v.text;
         }
         case ValueKind::Int:
         case ValueKind::Bool:
-            return m.Keep(std::to_string(v.i));
+            return pool.Keep(std::to_string(v.i));
         case ValueKind::Float: {
             char buf[64];
             std::snprintf(buf, sizeof buf, "%.17g", v.d);
-            return m.Keep(buf);
+            return pool.Keep(buf);
         }
     }
     return v.text;
@@ -367,6 +375,7 @@ void ReadModuleList(Design& d) {
     for (auto kv : mods) {
         Module m;
         m.name = kv.key;
+        m.nameText = d.pool.Keep(kv.key);
         if (kv.value.get_object().get(m.json))
             Fail("module '" + std::string(m.name) + "': expected an object");
         if (!d.moduleIndex.emplace(m.name, static_cast<uint32_t>(d.modules.size())).second)
@@ -374,7 +383,7 @@ void ReadModuleList(Design& d) {
         d.modules.push_back(std::move(m));
     }
     if (d.modules.empty()) Fail("no modules");
-    for (Module& m : d.modules) ReadModuleAttrs(m);
+    for (Module& m : d.modules) ReadModuleAttrs(m, d.pool);
     std::vector<uint32_t> stamp(d.modules.size(), 0);
     for (uint32_t i = 0; i < d.modules.size(); ++i) {
         ReadPorts(d, d.modules[i]);
@@ -392,26 +401,26 @@ void DigestModule(Design& d, Module& m) {
             where.key = kv.key;
             object no = AsObject(kv.value, where, "a net");
             NetEntry n;
-            n.name = kv.key;
+            n.name = d.pool.Keep(kv.key);
             n.hidden = ReadInt(no, "hide_name", 0, where) != 0;
             element bits;
             if (no.at_key("bits").get(bits)) Fail(where.Text() + ": missing \"bits\"");
             n.bitFirst = static_cast<uint32_t>(m.refs.size());
             n.width = ReadBits(bits, m, where);
             ReadRange(no, n.width, where, n.msb, n.lsb);
-            Attrs a = ReadNetAttrs(no, m, where);
+            Attrs a = ReadNetAttrs(no, d.pool, where);
             n.aka = a.aka;
-            auto pit = m.portIndex.find(n.name);
+            auto pit = m.portIndex.find(kv.key);
             if (pit != m.portIndex.end()) {
                 n.port = static_cast<int32_t>(pit->second);
-                if (!a.pinName.empty()) m.ports[pit->second].pinName = a.pinName;
+                if (*a.pinName) m.ports[pit->second].pinName = a.pinName;
             }
             if (a.global == "SETRESET" || a.global == "TRISTATE") {
-                if (n.width > 0 && !IsConst(m.refs[n.bitFirst])) {
+                if (n.width > 0 && m.refs[n.bitFirst] >= 0) {
                     GlobalNet g;
                     g.setReset = a.global == "SETRESET";
                     g.ref = static_cast<int32_t>(n.bitFirst);  // mapped below
-                    g.conn = static_cast<int32_t>(a.conn);
+                    g.conn = static_cast<int32_t>(g.setReset ? a.setResetConn : a.tristateConn);
                     g.floatVal = static_cast<int32_t>(a.floatVal);
                     m.globals.push_back(g);
                 }
@@ -421,8 +430,14 @@ void DigestModule(Design& d, Module& m) {
     }
     object cells;
     if (OptionalObject(m.json, "cells", Where{m.name, {}, {}, {}}, cells)) ReadCells(d, m, cells);
-    NameNets(m, d.scratch);
+    NameNets(m, d.scratch, d.pool);
     for (GlobalNet& g : m.globals) g.ref = m.refs[static_cast<size_t>(g.ref)];
+    // Growth left room at the ends of the tables; the model is built while
+    // they live.
+    Trim(m.refs);
+    Trim(m.cells);
+    Trim(m.conns);
+    Trim(m.params);
 }
 
 }  // namespace nlw_json

@@ -53,21 +53,21 @@ constexpr uint32_t kClassStep = 1u << 30;
 
 // Ranks: a port name first (in port order), then a public name, then an
 // internal one (in file order); bits nothing names rank last.
-void NameNets(Module& m, NameScratch& scratch) {
+void NameNets(Module& m, NameScratch& scratch, TextPool& pool) {
     const std::vector<NetEntry>& entries = scratch.entries;
     MapBits(m, scratch.bitMap);
     if (entries.size() >= kClassStep || m.ports.size() >= kClassStep)
         Fail(Where{m.name, {}, {}, {}}.Text() + ": too many nets");
     std::vector<NameCandidate>& cands = scratch.cands;
     cands.clear();
-    std::vector<std::string_view>& portAka = scratch.portAka;
-    portAka.assign(m.ports.size(), std::string_view());
+    std::vector<Text>& portAka = scratch.portAka;
+    portAka.assign(m.ports.size(), "");
     for (const NetEntry& e : entries)
         if (e.port >= 0) portAka[static_cast<size_t>(e.port)] = e.aka;
     for (size_t k = 0; k < m.ports.size(); ++k) {
         const Port& p = m.ports[k];
-        cands.push_back({p.name, p.bitFirst, p.width, p.msb, p.lsb, portAka[k],
-                         static_cast<uint32_t>(k)});
+        cands.push_back(
+            {p.name, p.bitFirst, p.width, p.msb, p.lsb, portAka[k], static_cast<uint32_t>(k)});
     }
     for (size_t j = 0; j < entries.size(); ++j) {
         const NetEntry& e = entries[j];
@@ -110,7 +110,7 @@ void NameNets(Module& m, NameScratch& scratch) {
             do {
                 name = "nlw_net_" + std::to_string(generated++);
             } while (used.count(name));
-            nn.name = m.Keep(std::move(name));
+            nn.name = pool.Keep(name);
             continue;
         }
         const NameCandidate& cd = cands[static_cast<size_t>(winner[n])];

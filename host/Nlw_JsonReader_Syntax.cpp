@@ -123,7 +123,8 @@ private:
                 char e = s_[p_];
                 if (e == 'u') {
                     for (int k = 1; k <= 4; ++k)
-                        if (p_ + k >= n_ || !std::isxdigit(static_cast<unsigned char>(s_[p_ + k]))) {
+                        if (p_ + k >= n_ ||
+                            !std::isxdigit(static_cast<unsigned char>(s_[p_ + k]))) {
                             p_ += k;
                             return false;
                         }
@@ -169,6 +170,8 @@ private:
 
 }  // namespace
 
-size_t FindSyntaxError(const char* text, size_t len) { return SyntaxCheck(text, len).Run(); }
+size_t FindSyntaxError(const char* text, size_t len) {
+    return SyntaxCheck(text, len).Run();
+}
 
 }  // namespace nlw_json

@@ -1,6 +1,7 @@
 // Unfolding the hierarchy: every instance of a module becomes a macro block
 // with its own ports, signals and children, made depth-first in cell order.
 // The walk keeps its own stack, so nesting depth is bounded only by memory.
+#include <deque>
 #include <string>
 
 #include "Nlw_JsonReader_Internal.h"
@@ -16,7 +17,7 @@ struct Frame {
     std::vector<Nlw_NlSignal*> signals;
     Nlw_NlSignal* consts[4] = {nullptr, nullptr, nullptr, nullptr};
     // The top-level port pin name that reaches each net, for pad cells.
-    std::vector<std::string_view> pinNames;
+    std::vector<Text> pinNames;
 };
 
 class Unfolder {
@@ -37,8 +38,8 @@ public:
 
 private:
     // Signals of a new frame's module and the inside connections of its
-    // ports. parentFrame and via (the cell it was made for) are null for the
-    // top.
+    // ports. parent and via (the cell the frame's block was made for) are
+    // null for the top.
     void Open(const Frame* parent, const Cell* via) {
         Frame& f = stack_.back();
         const Module& m = d_.modules[f.module];
@@ -50,13 +51,13 @@ private:
                 Nlw_NlBus*& bus = buses_[static_cast<size_t>(nn.bus)];
                 if (!bus) {
                     const NetBus& nb = m.buses[static_cast<size_t>(nn.bus)];
-                    bus = b_.AddSignalBus(f.block, nb.name.data(), nb.msb, nb.lsb);
-                    if (!nb.aka.empty()) bus->SetAka(nb.aka.data());
+                    bus = b_.AddSignalBus(f.block, nb.name, nb.msb, nb.lsb);
+                    if (*nb.aka) bus->SetAka(nb.aka);
                 }
                 f.signals[n] = b_.GetSignalBusMember(bus, nn.index);
             } else {
-                f.signals[n] = b_.AddSignal(f.block, nn.name.data());
-                if (!nn.aka.empty()) f.signals[n]->SetAka(nn.aka.data());
+                f.signals[n] = b_.AddSignal(f.block, nn.name);
+                if (*nn.aka) f.signals[n]->SetAka(nn.aka);
             }
         }
         for (const Port& p : m.ports)
@@ -70,13 +71,12 @@ private:
     }
 
     void InheritPinNames(Frame& f, const Module& m, const Frame* parent, const Cell* via) {
-        f.pinNames.assign(m.numNets, std::string_view());
+        f.pinNames.assign(m.numNets, "");
         if (!parent) {
             for (const Port& p : m.ports)
-                for (uint32_t i = 0; i < p.width && !p.pinName.empty(); ++i) {
+                for (uint32_t i = 0; i < p.width && *p.pinName; ++i) {
                     int32_t ref = m.refs[p.bitFirst + i];
-                    if (ref >= 0 && f.pinNames[size_t(ref)].empty())
-                        f.pinNames[size_t(ref)] = p.pinName;
+                    if (ref >= 0 && !*f.pinNames[size_t(ref)]) f.pinNames[size_t(ref)] = p.pinName;
                 }
             return;
         }
@@ -87,7 +87,7 @@ private:
             for (uint32_t i = 0; i < cn.width; ++i) {
                 int32_t outer = pm.refs[cn.bitFirst + i];
                 int32_t inner = m.refs[p.bitFirst + i];
-                if (outer >= 0 && inner >= 0 && f.pinNames[size_t(inner)].empty())
+                if (outer >= 0 && inner >= 0 && !*f.pinNames[size_t(inner)])
                     f.pinNames[size_t(inner)] = parent->pinNames[size_t(outer)];
             }
         }
@@ -102,20 +102,21 @@ private:
             Frame& f = stack_[fi];
             const Cell& c = m.cells[f.nextCell++];
             if (!c.macro) {
-                const LibType& lt = d_.types[c.type];
-                std::string_view padName;
-                if (lt.pad && c.pinName.empty() && !f.pinNames.empty()) {
+                const LibVariant& v = d_.variants[c.type];
+                const LibType& lt = d_.types[v.base];
+                Text padName = "";
+                if (lt.pad && !*m.ExtraOf(c).pinName && !f.pinNames.empty()) {
                     int32_t ref = PadPinRef(m, c, lt);
                     if (ref >= 0) padName = f.pinNames[size_t(ref)];
                 }
                 std::vector<Nlw_NlSignal*>& sig = f.signals;
-                CreateLeafCell(b_, m, c, lt, f.block, c.name.data(), padName,
+                CreateLeafCell(b_, m, c, v, lt, f.block, c.name, padName,
                                [&sig](int32_t ref, int32_t&) { return sig[size_t(ref)]; });
                 continue;
             }
             Module& child = d_.modules[c.type];
-            Nlw_NlBlock* mb = b_.CreateMacro(f.block, ModuleType(child, b_), c.name.data());
-            if (!c.aka.empty()) mb->SetAka(c.aka.data());
+            Nlw_NlBlock* mb = b_.CreateMacro(f.block, ModuleType(child, b_), c.name);
+            if (*m.ExtraOf(c).aka) mb->SetAka(m.ExtraOf(c).aka);
             AddPorts(b_, child, mb);
             for (uint32_t k = 0; k < c.connCount; ++k) {
                 const Conn& cn = m.conns[c.connFirst + k];
@@ -129,7 +130,7 @@ private:
                         b_.SetTieOff(pin, ref == kConst1 ? 1 : 0);
                 }
             }
-            AddBlockProperties(m, c, nullptr, {}, mb);
+            AddBlockProperties(m, c, nullptr, "", mb);
             stack_.emplace_back();
             stack_.back().block = mb;
             stack_.back().module = c.type;
@@ -149,6 +150,8 @@ private:
 
 }  // namespace
 
-void BuildUnfolded(Design& d, Nlw_NlView& view) { Unfolder(d, view).Run(); }
+void BuildUnfolded(Design& d, Nlw_NlView& view) {
+    Unfolder(d, view).Run();
+}
 
 }  // namespace nlw_json

@@ -17,16 +17,6 @@ int64_t WidthOf(int32_t msb, int32_t lsb) {
     return (msb > lsb ? int64_t(msb) - lsb : int64_t(lsb) - msb) + 1;
 }
 
-// "name[i]" in the output delimiter style.
-std::string MemberName(const char* base, int64_t index) {
-    const int style = Nlw_NlBus::GetOutputDelimiterType();
-    std::string text(base);
-    text += Nlw_NlBus::GetLeftDelimiter(style);
-    text += std::to_string(index);
-    text += Nlw_NlBus::GetRightDelimiter(style);
-    return text;
-}
-
 bool CheckWidth(const char* what, const char* name, int32_t msb, int32_t lsb) {
     if (WidthOf(msb, lsb) <= kMaxBusWidth) return true;
     NLW_MSG().issueInternal("Nlw_NlBuilder: %s %s[%d:%d] is too wide; it is left out.\n", what,
@@ -82,19 +72,11 @@ Nlw_NlPinBus* Nlw_NlBuilder::AddTypePinBus(Nlw_NlType* type, const char* name, i
         return nullptr;
     }
     if (!CheckWidth("pin bus", name, msb, lsb)) return nullptr;
-    Nlw_NlPinBus* bus = static_cast<Nlw_NlPinBus*>(NewBus(name, msb, lsb, true));
-    bus->dir_ = static_cast<uint8_t>(dir);
+    Nlw_NlPinBus* bus = NewPinBus(name, dir, msb, lsb, type->pinDefs_.size());
     bus->type_ = type;
-    const int64_t width = WidthOf(msb, lsb);
-    const size_t first = type->pinDefs_.size();
-    // Members run from msb to lsb; the member of the lowest index is the
-    // last when msb > lsb and the first otherwise.
-    bus->posStep_ = msb >= lsb ? -1 : 1;
-    bus->firstPinPos_ = static_cast<int32_t>(msb >= lsb ? first + width - 1 : first);
-    const int step = msb >= lsb ? -1 : 1;
-    for (int64_t i = msb;; i += step) {
-        type->pinDefs_.push_back(
-            {view_->Intern(MemberName(bus->name_, i).c_str()), static_cast<uint8_t>(dir), 0, bus});
+    for (int64_t i = msb;; i += bus->posStep_ > 0 ? 1 : -1) {
+        type->pinDefs_.push_back({view_->Intern(Nlw_NlMemberName(bus->name_, i).c_str()),
+                                  static_cast<uint8_t>(dir), 0, bus});
         if (i == lsb) break;
     }
     type->pinBuses_.push_back(bus);
@@ -236,15 +218,11 @@ Nlw_NlPinBus* Nlw_NlBuilder::AddPortBus(Nlw_NlBlock* macro, const char* name, in
     if (needed > data.pinCapacity)
         GrowPins(macro, needed > 2 * data.pinCapacity ? needed : 2 * data.pinCapacity);
 
-    Nlw_NlPinBus* bus = static_cast<Nlw_NlPinBus*>(NewBus(name, msb, lsb, true));
-    bus->dir_ = static_cast<uint8_t>(dir);
+    Nlw_NlPinBus* bus = NewPinBus(name, dir, msb, lsb, macro->numPins_);
     bus->owner_ = macro;
-    const size_t first = macro->numPins_;
-    bus->posStep_ = msb >= lsb ? -1 : 1;
-    bus->firstPinPos_ = static_cast<int32_t>(msb >= lsb ? first + width - 1 : first);
-    const int step = msb >= lsb ? -1 : 1;
-    for (int64_t i = msb;; i += step) {
-        Nlw_NlPin* pin = AppendPort(macro, view_->Intern(MemberName(bus->name_, i).c_str()), dir);
+    for (int64_t i = msb;; i += bus->posStep_ > 0 ? 1 : -1) {
+        Nlw_NlPin* pin =
+            AppendPort(macro, view_->Intern(Nlw_NlMemberName(bus->name_, i).c_str()), dir);
         pin->bus_ = bus;
         if (i == lsb) break;
     }
@@ -269,6 +247,18 @@ Nlw_NlBus* Nlw_NlBuilder::NewBus(const char* name, int32_t msb, int32_t lsb, boo
     bus->msb_ = msb;
     bus->lsb_ = lsb;
     bus->isPinBus_ = pinBus;
+    return bus;
+}
+
+Nlw_NlPinBus* Nlw_NlBuilder::NewPinBus(const char* name, int dir, int32_t msb, int32_t lsb,
+                                       size_t firstPin) {
+    Nlw_NlPinBus* bus = static_cast<Nlw_NlPinBus*>(NewBus(name, msb, lsb, true));
+    bus->dir_ = static_cast<uint8_t>(dir);
+    // Members follow from firstPin, from msb to lsb; the member of the
+    // lowest index is the last when msb > lsb and the first otherwise.
+    bus->posStep_ = msb >= lsb ? -1 : 1;
+    bus->firstPinPos_ =
+        static_cast<int32_t>(msb >= lsb ? firstPin + WidthOf(msb, lsb) - 1 : firstPin);
     return bus;
 }
 
@@ -308,7 +298,7 @@ Nlw_NlSignal* Nlw_NlBuilder::GetSignalBusMember(Nlw_NlBus* bus, int32_t index) {
     if (index < low || index > high) return nullptr;
     void*& slot = bus->members_[int64_t(index) - low];
     if (slot == nullptr) {
-        const std::string name = MemberName(bus->name_, index);
+        const std::string name = Nlw_NlMemberName(bus->name_, index);
         Nlw_NlSignal* signal = NewSignal(bus->owner_, name.data(), name.size());
         signal->bus_ = bus;
         slot = signal;

@@ -69,6 +69,8 @@ public:
 
 private:
     Nlw_NlBus* NewBus(const char* name, int32_t msb, int32_t lsb, bool pinBus);
+    // A pin bus whose members will be the pins from position firstPin on.
+    Nlw_NlPinBus* NewPinBus(const char* name, int dir, int32_t msb, int32_t lsb, size_t firstPin);
     Nlw_NlBlock* NewBlock(Nlw_NlBlock* parent, Nlw_NlType* type, const char* instanceName,
                           bool macro);
     Nlw_NlPin* AppendPort(Nlw_NlBlock* macro, const char* name, int dir);
@@ -116,6 +118,9 @@ struct Nlw_NlNameIndex {
 // end ("[" "]"; style 7 also "<" ">" and "(" ")"). On success gives the
 // position of the left delimiter and the value.
 bool Nlw_NlSplitIndex(const char* name, size_t end, int style, size_t& left, int32_t& value);
+
+// A bus member's name: "base[index]" in the output delimiter style.
+std::string Nlw_NlMemberName(const char* base, int64_t index);
 
 // What only a macro block carries.
 struct Nlw_NlBlock::MacroData {

@@ -48,6 +48,15 @@ bool Nlw_NlSplitIndex(const char* name, size_t end, int style, size_t& left, int
     return true;
 }
 
+std::string Nlw_NlMemberName(const char* base, int64_t index) {
+    const int style = gOutputDelimiterType;
+    std::string text(base);
+    text += Nlw_NlBus::GetLeftDelimiter(style);
+    text += std::to_string(index);
+    text += Nlw_NlBus::GetRightDelimiter(style);
+    return text;
+}
+
 void Nlw_NlBus::SetMultiDimensions(bool on) {
     gMultiDimensions = on;
 }

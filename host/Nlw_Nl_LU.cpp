@@ -23,6 +23,27 @@ std::string_view KeyOf(std::string_view name) {
     return IsEscapedForm(name) ? name.substr(1, name.size() - 2) : name;
 }
 
+// A blank, tab, line break or other control character inside a name ends an
+// escaped identifier early or breaks the line it stands on, whatever the
+// format's own rules let through (an escaped name's closing blank aside).
+bool IsBreaking(unsigned char c) { return c <= ' ' || c == 0x7f; }
+
+bool HasBreakingCharacter(std::string_view name) {
+    std::string_view inner = KeyOf(name);
+    for (unsigned char c : inner)
+        if (IsBreaking(c)) return true;
+    return false;
+}
+
+std::string ReplaceBreakingCharacters(std::string_view name) {
+    std::string text(name);
+    const size_t first = IsEscapedForm(name) ? 1 : 0;
+    const size_t end = IsEscapedForm(name) ? text.size() - 1 : text.size();
+    for (size_t i = first; i < end; ++i)
+        if (IsBreaking(static_cast<unsigned char>(text[i]))) text[i] = '_';
+    return text;
+}
+
 // The longest member index text a bus can need, such as "[-2147483648]".
 size_t IndexTextLength(const Nlw_NlBus* bus) {
     const size_t a = std::to_string(bus->GetMSB(0)).size();
@@ -32,15 +53,6 @@ size_t IndexTextLength(const Nlw_NlBus* bus) {
 
 size_t BusLimit(const Nlw_NlBus* bus) {
     return kMax - IndexTextLength(bus);
-}
-
-std::string MemberName(const char* base, int64_t index) {
-    const int style = Nlw_NlBus::GetOutputDelimiterType();
-    std::string text(base);
-    text += Nlw_NlBus::GetLeftDelimiter(style);
-    text += std::to_string(index);
-    text += Nlw_NlBus::GetRightDelimiter(style);
-    return text;
 }
 
 // A long name keeps its beginning and gets a hash of the whole, so that
@@ -222,7 +234,7 @@ void FollowPinBus(const Nlw_NlPinBus* bus, bool bridge) {
     const int64_t high = bus->GetMSB(0) < bus->GetLSB(0) ? bus->GetLSB(0) : bus->GetMSB(0);
     for (int64_t i = low; i <= high; ++i) {
         if (Nlw_NlPin* pin = bus->GetPinMember(static_cast<int32_t>(i)))
-            Rename(pin, MemberName(bus->GetWritableName(), i), bridge);
+            Rename(pin, Nlw_NlMemberName(bus->GetWritableName(), i), bridge);
     }
 }
 
@@ -231,7 +243,7 @@ void FollowSignalBus(const Nlw_NlBus* bus, bool bridge) {
     const int64_t high = bus->GetMSB(0) < bus->GetLSB(0) ? bus->GetLSB(0) : bus->GetMSB(0);
     for (int64_t i = low; i <= high; ++i) {
         if (Nlw_NlSignal* s = bus->GetSignalMember(static_cast<int32_t>(i)))
-            Rename(s, MemberName(bus->GetWritableName(), i), bridge);
+            Rename(s, Nlw_NlMemberName(bus->GetWritableName(), i), bridge);
     }
 }
 
@@ -252,6 +264,11 @@ bool Nlw_Nl_LU::Prepare(const char* name, bool isBused, bool keywords, size_t li
         }
     }
     std::string_view current = changed ? std::string_view(text) : std::string_view(name);
+    if (HasBreakingCharacter(current)) {
+        text = ReplaceBreakingCharacters(current);
+        changed = true;
+        current = text;
+    }
     if (keywords && UsesEscapedNames() &&
         Nlw_Nl_SpkCache::IsKeyword(current.data(), current.size())) {
         text = "\\" + std::string(current) + " ";
@@ -291,6 +308,13 @@ void Nlw_Nl_LU::ProcessTypes() {
     }
 }
 
+// A global signal is written under its name as it stands (a constant such as
+// 1'b0, or a hierarchical reference) and never declared: it keeps its name
+// and takes none from the module's namespace.
+static bool IsGlobalSignal(const Nlw_NlSignal* s) {
+    return s->GetPropertyByName("NLW_GLOBAL_SIGNAL") != nullptr;
+}
+
 void Nlw_Nl_LU::ProcessMacro(Nlw_NlBlock* macro) {
     const bool keywords = Nlw_Nl_SpkCache::IsBuilt();
     const UT_DARRAY<Nlw_NlPinBus*>* pinBuses = macro->GetPinBuses();
@@ -310,7 +334,8 @@ void Nlw_Nl_LU::ProcessMacro(Nlw_NlBlock* macro) {
             if (Prepare(bus->GetWritableName(), false, keywords, BusLimit(bus), name))
                 Rename(bus, name, bridge_);
     for (Nlw_NlSignal* s : macro->GetSignals())
-        if (Prepare(s->GetWritableName(), s->IsBused(), keywords && !s->IsBused(), kMax, name))
+        if (!IsGlobalSignal(s) &&
+            Prepare(s->GetWritableName(), s->IsBused(), keywords && !s->IsBused(), kMax, name))
             Rename(s, name, bridge_);
     if (signalBuses)
         for (Nlw_NlBus* bus : *signalBuses)
@@ -332,7 +357,7 @@ void Nlw_Nl_LU::ProcessMacro(Nlw_NlBlock* macro) {
     if (pinBuses)
         for (Nlw_NlPinBus* bus : *pinBuses) claim(bus, nullptr, InsideBus(bus), BusLimit(bus));
     for (Nlw_NlSignal* s : macro->GetSignals())
-        if (!s->IsBused()) claim(s, s, nullptr, kMax);
+        if (!s->IsBused() && !IsGlobalSignal(s)) claim(s, s, nullptr, kMax);
     if (signalBuses)
         for (Nlw_NlBus* bus : *signalBuses) claim(bus, bus, nullptr, BusLimit(bus));
     for (Nlw_NlBlock* child : macro->GetChildren()) claim(child, nullptr, nullptr, kMax);
@@ -380,7 +405,7 @@ void Nlw_Nl_LU::ProcessCellPins() {
             // Members lie at fixed positions of the definitions.
             const int64_t low = bus->msb_ < bus->lsb_ ? bus->msb_ : bus->lsb_;
             for (int64_t i = 0; i < bus->GetWidth(); ++i) {
-                const std::string member = MemberName(bus->GetWritableName(), low + i);
+                const std::string member = Nlw_NlMemberName(bus->GetWritableName(), low + i);
                 Nlw_NlType::PinDef& def = defs[bus->firstPinPos_ + bus->posStep_ * i];
                 if (member != def.name) setDef(def, member);
             }

@@ -63,9 +63,9 @@ Ldm_TypeLib* Nlw_Prep::LoadInstallationData(Nlw_NetlistWriter& nlw) {
         for (const Nlw_Property& def : *entry.second) {
             const char* t = def.GetType().c_str();
             if (UT_STR::ICompare(t, "HV") != 0 && UT_STR::ICompare(t, "BV") != 0) continue;
-            type->AddDefinition("Config_General_Data",
-                                Vdm_Property::NewTypeDef(def.GetName().c_str(),
-                                                         {def.GetDefault().str()}));
+            type->AddDefinition(
+                "Config_General_Data",
+                Vdm_Property::NewTypeDef(def.GetName().c_str(), {def.GetDefault().str()}));
         }
     }
     return lib;

@@ -14,7 +14,9 @@
 
 namespace {
 
-bool Is(const char* type, const char* what) { return UT_STR::ICompare(type, what) == 0; }
+bool Is(const char* type, const char* what) {
+    return UT_STR::ICompare(type, what) == 0;
+}
 
 bool HasUnknownBits(const std::string& bits) {
     return bits.find_first_not_of("01") != std::string::npos;

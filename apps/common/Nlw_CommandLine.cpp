@@ -23,8 +23,6 @@ struct Option {
     std::function<std::string(Nlw_CommandLine&, const std::string&)> apply;
 };
 
-std::string Accept(Nlw_CommandLine&, const std::string&) { return ""; }
-
 // An option whose data this host does not have: accepted with a warning.
 std::string Ignore(Nlw_CommandLine& cl, const std::string&, const char* name) {
     cl.ignored.push_back(name);

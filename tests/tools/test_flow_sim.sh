@@ -74,7 +74,7 @@ fail() {
     failures=$((failures + 1))
 }
 
-# Prints the last lines of a log, indented, after a failure.
+# Prints the start of a log, indented, after a failure.
 show() {
     sed -n '1,40p' "$1" | sed 's/^/    /'
 }
@@ -132,19 +132,23 @@ make_netlists() { # JSON TOP DIR
         return 0
     fi
     "$qdb2ver" -ism -w "$json" "$dir/net.v" > "$dir/netlist.log" 2>&1 || return 1
-    "$qdb2ver" -w -insert_chipwide false "$json" "$dir/plain.v" >> "$dir/netlist.log" 2>&1
+    "$qdb2ver" -w -insert_chipwide false "$json" "$dir/plain.v" >> "$dir/netlist.log" 2>&1 ||
+        return 1
+    # A warning here means that the installation's tables do not fit what
+    # the flow writes (a parameter of the wrong type, for example).
+    ! grep -q -i -e 'warning' -e 'error' "$dir/netlist.log"
 }
 
 prove() { # RTL... -- PLAIN TOP DIR
-    local rtl=()
+    local files=()
     while [ "$1" != "--" ]; do
-        rtl+=("$1")
+        files+=("$1")
         shift
     done
     local plain=$2 top=$3 dir=$4
     {
         echo "read_verilog -lib $share/verilog/src/funcells/*.v"
-        echo "read_verilog ${rtl[*]}"
+        echo "read_verilog ${files[*]}"
         echo "prep -top $top"
         # Memories, also the ROMs yosys makes of case tables, as flops and
         # logic that the equivalence passes understand.
@@ -352,11 +356,15 @@ if [ "$use_yosys_netlist" = 0 ] && [ ${#only[@]} -eq 0 ]; then
     third="$look/third"
     cp -r "$share" "$third"
     rm "$third/verilog/src/chipwide.v" "$third/verilog/src/timcells/V_FDRSE.v"
-    VORNIX="$third" "$qdb2ver" -ism -w "$json" "$look/missing.v" > "$look/missing.log" 2>&1
-    if ! grep -q 'No module file found for model V_FDRSE\.' "$look/missing.log"; then
+    missing_status=0
+    VORNIX="$third" "$qdb2ver" -ism -w "$json" "$look/missing.v" > "$look/missing.log" 2>&1 ||
+        missing_status=$?
+    if [ "$missing_status" = 0 ]; then
+        fail "missing model: qdb2ver reports success after an error"
+    elif ! grep -q 'No module file found for model V_FDRSE\.' "$look/missing.log"; then
         fail "missing model: no message"
         show "$look/missing.log"
-    elif ! grep -q 'chipwide.v module can.t be found in directory \$VORNIX/verilog/src' \
+    elif ! grep -q "chipwide.v module can.t be found in directory \\\$VORNIX/verilog/src" \
         "$look/missing.log"; then
         fail "missing chipwide module: no message"
         show "$look/missing.log"

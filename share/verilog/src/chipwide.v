@@ -7,7 +7,8 @@
 // initial value meanwhile. GTS, the global tristate, is 0: while it is 1
 // every output buffer floats.
 //
-// Both are nets with weak drivers, so that a test bench can take them over
+// Both are nets with weak drivers (constant 0 for yosys, which reads
+// neither strengths nor delays), so that a test bench can take them over
 // with an ordinary continuous assignment such as
 //   assign chipwide.GSR = my_gsr;
 //
@@ -23,6 +24,12 @@
 module chipwide;
   wire GSR;
   wire GTS;
+`ifdef YOSYS
+  // Synthesis and formal tools see the globals inactive: no drive
+  // strengths, no delays.
+  assign GSR = 1'b0;
+  assign GTS = 1'b0;
+`else
   reg gsr_drive;
   reg gts_drive;
 
@@ -34,5 +41,6 @@ module chipwide;
     gts_drive = 1'b0;
     #100 gsr_drive = 1'b0;
   end
+`endif
 endmodule
 `endif

@@ -25,6 +25,8 @@ import subprocess
 import sys
 import xml.etree.ElementTree as ET
 
+# No bytecode cache in the source tree.
+sys.dont_write_bytecode = True
 sys.path.insert(0, os.path.dirname(os.path.abspath(__file__)))
 from installation import Installation, big_ending, recursive_inclusions  # noqa: E402
 

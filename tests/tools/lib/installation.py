@@ -96,7 +96,8 @@ def recursive_inclusions(acd_path):
     deps = {}
     for item in read_keys(acd_path).get("RecursiveInclusion", []):
         pieces = item.split(":")
-        deps.setdefault(pieces[0].upper(), []).extend(pieces[1:] or pieces[:1])
+        # A single name stands for the model itself, no dependency.
+        deps.setdefault(pieces[0].upper(), []).extend(pieces[1:])
     return deps
 
 

@@ -9,6 +9,8 @@ import json
 import os
 import sys
 
+# No bytecode cache in the source tree.
+sys.dont_write_bytecode = True
 sys.path.insert(0, os.path.dirname(os.path.abspath(__file__)))
 from installation import Installation, recursive_inclusions  # noqa: E402
 

@@ -152,12 +152,12 @@ TEST_F(VerilogWriterPorts, GlobalSignalIsWrittenUnescaped) {
     Nlw_NlBlock* m = Root();
     Nlw_NlPin* in = b_.AddPort(m, "gsr", NLW_DIR_INPUT);
     Nlw_NlPin* out = b_.AddPort(m, "o", NLW_DIR_OUTPUT);
-    Nlw_NlSignal* gsr = b_.AddSignal(m, "glbl.GSR");
+    Nlw_NlSignal* gsr = b_.AddSignal(m, "chipwide.GSR");
     gsr->AddProperty(Vdm_Property::NewBool("NLW_GLOBAL_SIGNAL", true));
     b_.ConnectChild(in, gsr);
     b_.ConnectChild(out, b_.AddSignal(m, "n.o"));
     const std::string text = Module(m);
-    EXPECT_NE(text.find("  assign\n    glbl.GSR = gsr,\n    o = \\n.o ;\n"), std::string::npos)
+    EXPECT_NE(text.find("  assign\n    chipwide.GSR = gsr,\n    o = \\n.o ;\n"), std::string::npos)
         << text;
 }
 

@@ -10,14 +10,15 @@ namespace {
 TEST(CellLibrary, ReadsCellsPinsBusesAndPads) {
     Nlw_CellLibrary lib;
     std::string error;
-    ASSERT_TRUE(lib.Parse("# comment\n"
-                          "cell A timcell   # trailing comment\n"
-                          "  pin X input\n"
-                          "\tbus D inout 0 7\n"
-                          "\n"
-                          "cell P funcell pad\r\n"
-                          "pin PAD output pad\r\n",
-                          "cells.dat", error))
+    ASSERT_TRUE(
+        lib.Parse("# comment\n"
+                  "cell A timcell   # trailing comment\n"
+                  "  pin X input\n"
+                  "\tbus D inout 0 7\n"
+                  "\n"
+                  "cell P funcell pad\r\n"
+                  "pin PAD output pad\r\n",
+                  "cells.dat", error))
         << error;
     ASSERT_EQ(lib.size(), 2u);
     const Nlw_CellDef* a = lib.Find("A");

@@ -11,6 +11,8 @@ const std::string kBad = std::string(NLW_TEST_DATA_DIR) + "/bad/";
 void ExpectOneError(const Loaded& l, const std::string& file,
                     const std::vector<std::string>& parts) {
     EXPECT_FALSE(l.ok) << file;
+    EXPECT_EQ(l.root(), nullptr) << file;  // found before anything was made
+    EXPECT_EQ(l.view->GetTypes().size(), 0u) << file;
     ASSERT_EQ(l.errors.size(), 1u) << file;
     const std::string& e = l.errors[0];
     EXPECT_EQ(e.rfind(file, 0), 0u) << e;
@@ -23,8 +25,7 @@ TEST(JsonReaderBadInput, ReportsEachFaultOnce) {
         const char* file;
         std::vector<std::string> parts;
     } cases[] = {
-        {"wrong_type.json",
-         {"module 'm' cell 'c' connection 'A': expected an array of bits"}},
+        {"wrong_type.json", {"module 'm' cell 'c' connection 'A': expected an array of bits"}},
         {"bad_bit.json", {"module 'm' port 'a'", "bad bit value \"q\""}},
         {"no_modules.json", {"no modules"}},
         {"not_an_object.json", {"expected a JSON object"}},
@@ -73,7 +74,7 @@ TEST(JsonReaderBadInput, SurvivesDeepNestingAndOddDocuments) {
         std::string text;
         std::string part;
     } cases[] = {
-        {deep, "malformed JSON"},                              // deeper than the parser goes
+        {deep, "malformed JSON"},  // deeper than the parser goes
         {std::string(100000, '['), "malformed JSON at byte offset 100000"},
         {"", "malformed JSON"},
         {"{\"modules\": {\"m\": {\"ports\": {}}}} x", "at byte offset 34"},

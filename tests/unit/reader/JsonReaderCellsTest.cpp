@@ -122,9 +122,14 @@ TEST(JsonReaderTypes, TakesPinsFromLibraryBlackboxAndConnections) {
     EXPECT_EQ(NetOf(b, "X[1]"), "d[5]");
     EXPECT_EQ(b->GetPinByAlias("Y")->GetDirection(), NLW_DIR_OUTPUT);
 
-    // MYST: the union of both instances' pins, widened to the widest
-    // connection, directions where any instance gives one.
+    // MYST: the union of both instances' pins, directions where any
+    // instance gives one, each pin as wide as the instance connects it.
+    Nlw_NlBlock* m1 = Child(l.root(), "m1");
     Nlw_NlBlock* m2 = Child(l.root(), "m2");
+    ASSERT_NE(m1->GetPinByAlias("K"), nullptr);
+    EXPECT_FALSE(m1->GetPinByAlias("K")->IsBused());
+    EXPECT_EQ(NetOf(m1, "K"), "d[2]");
+    EXPECT_STREQ(m1->GetTypeName(), m2->GetTypeName());
     struct Case {
         const char* pin;
         int dir;

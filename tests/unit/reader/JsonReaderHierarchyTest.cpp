@@ -50,8 +50,8 @@ TEST_F(JsonReaderHierarchy, UnfoldsEveryInstanceDepthFirst) {
     std::vector<std::string> macros;
     for (Nlw_NlBlock* m : l.view->GetMacros())
         macros.push_back(std::string(m->GetTypeName()) + ":" + m->GetInstanceName());
-    EXPECT_EQ(macros, (std::vector<std::string>{"top:top", "mid:u1", "leafm:u2", "mid:u3",
-                                                "leafm:u2"}));
+    EXPECT_EQ(macros,
+              (std::vector<std::string>{"top:top", "mid:u1", "leafm:u2", "mid:u3", "leafm:u2"}));
     Nlw_NlBlock* u1 = Child(l.root(), "u1");
     Nlw_NlBlock* u3 = Child(l.root(), "u3");
     ASSERT_TRUE(u1 && u3);
@@ -83,22 +83,22 @@ TEST_F(JsonReaderHierarchy, FlattensIntoLeavesOfTheTopNamedByPath) {
         EXPECT_FALSE(c->IsMacro());
         leaves.push_back(c->GetInstanceName());
     }
-    EXPECT_EQ(leaves, (std::vector<std::string>{"u1/g", "u1/u2/r0", "u1/u2/r1", "u3/g",
-                                                "u3/u2/r0", "u3/u2/r1"}));
+    EXPECT_EQ(leaves, (std::vector<std::string>{"u1/g", "u1/u2/r0", "u1/u2/r1", "u3/g", "u3/u2/r0",
+                                                "u3/u2/r1"}));
     struct Case {
         const char* cell;
         const char* pin;
         const char* net;  // "" with tie >= 0 for a tied pin
         int tie;
     } cases[] = {
-        {"u1/u2/r0", "D", "a[0]", -1},        // merged up to the top's port net
-        {"u1/u2/r0", "C", "clk", -1},         //
-        {"u1/g", "O", "y[0]", -1},            // mid's o[0] is the top's y[0]
-        {"u1/g", "I0", "u1/inner[0]", -1},    // mid's name wins over leafm's q
-        {"u3/u2/r0", "D", "", 1},             // a constant passed down two levels
-        {"u3/u2/r1", "D", "a[0]", -1},        //
-        {"u3/g", "O", "w[0]", -1},            //
-        {"u1/u2/r1", "Q", "u1/inner[1]", -1}, //
+        {"u1/u2/r0", "D", "a[0]", -1},         // merged up to the top's port net
+        {"u1/u2/r0", "C", "clk", -1},          //
+        {"u1/g", "O", "y[0]", -1},             // mid's o[0] is the top's y[0]
+        {"u1/g", "I0", "u1/inner[0]", -1},     // mid's name wins over leafm's q
+        {"u3/u2/r0", "D", "", 1},              // a constant passed down two levels
+        {"u3/u2/r1", "D", "a[0]", -1},         //
+        {"u3/g", "O", "w[0]", -1},             //
+        {"u1/u2/r1", "Q", "u1/inner[1]", -1},  //
     };
     for (const Case& c : cases) {
         Nlw_NlBlock* b = Child(l.root(), c.cell);
@@ -130,8 +130,8 @@ TEST_F(JsonReaderHierarchy, ChoosesTheTopModule) {
         const char* top;  // the option
         const char* chosen;
     } cases[] = {
-        {twoFree, nullptr, "b"},   // the "top" attribute
-        {twoFree, "a", "a"},       // the option wins
+        {twoFree, nullptr, "b"},      // the "top" attribute
+        {twoFree, "a", "a"},          // the option wins
         {parentChild, nullptr, "p"},  // the one module nothing instantiates
         {parentChild, "c", "c"},
     };

@@ -1,4 +1,6 @@
 // Netlists that yosys writes from small designs, read back.
+#include <set>
+
 #include "Nlw_Util.h"
 #include "ReaderTestSupport.h"
 
@@ -78,26 +80,42 @@ TEST_F(JsonReaderYosys, ReadsHierarchyBusesAndConstants) {
     EXPECT_EQ(NetOf(s, "u[1]"), "u[1]");
 }
 
-TEST_F(JsonReaderYosys, ReadsLookupTablesWithTheirContents) {
-    Loaded l = Synth("module t(input a, b, c, output y); assign y = (a & b) | c; endmodule",
+TEST_F(JsonReaderYosys, ReadsLookupTablesOfEveryWidth) {
+    Loaded l = Synth(R"(
+module t(input [3:0] a, input [3:0] b, input cin, output [4:0] s, output eq);
+  assign s = a + b + cin;
+  assign eq = a == b;
+endmodule)",
                      "synth -top t -lut 4");
     if (!l.ok) return;
-    int luts = 0;
+    std::set<int> widths;
     for (Nlw_NlBlock* c : l.root()->GetChildren()) {
-        if (std::string(c->GetTypeName()) != "$lut") continue;
-        ++luts;
+        ASSERT_STREQ(c->GetTypeName(), "$lut");
+        const Vdm_Property* width = c->GetPropertyByName("WIDTH");
         const Vdm_Property* lut = c->GetPropertyByName("LUT");
-        ASSERT_NE(lut, nullptr);
+        ASSERT_TRUE(width && lut);
         EXPECT_EQ(lut->GetType(), VDM_PROP_BITS);
-        EXPECT_EQ(std::string(lut->GetString()).size(), 8u);
+        int w = static_cast<int>(std::stoul(width->GetString(), nullptr, 2));
+        widths.insert(w);
+        EXPECT_EQ(std::string(lut->GetString()).size(), size_t(1) << w);
+        // Each table's input bus is as wide as the table, every bit driven.
+        Nlw_NlPin* y = c->GetPinByAlias("Y");
+        ASSERT_NE(y, nullptr);
+        EXPECT_EQ(y->GetDirection(), NLW_DIR_OUTPUT);
+        if (w == 1) {
+            EXPECT_NE(NetOf(c, "A"), "");
+            continue;
+        }
         Nlw_NlPinBus* a = PinBus(c, "A");
         ASSERT_NE(a, nullptr);
         EXPECT_EQ(a->GetDirection(), NLW_DIR_INPUT);
-        EXPECT_EQ(a->GetWidth(), 3);
-        EXPECT_EQ(c->GetPinByAlias("Y")->GetDirection(), NLW_DIR_OUTPUT);
-        EXPECT_EQ(NetOf(c, "Y"), "y");
+        EXPECT_EQ(a->GetWidth(), w);
+        for (int i = 0; i < w; ++i) {
+            std::string bit = "A[" + std::to_string(i) + "]";
+            EXPECT_TRUE(NetOf(c, bit) != "" || TieOf(c, bit) >= 0) << bit;
+        }
     }
-    EXPECT_EQ(luts, 1);
+    EXPECT_GT(widths.size(), 1u);
     EXPECT_TRUE(l.warnings.empty());
 }
 

@@ -48,7 +48,7 @@ TEST(PrepConvert, TurnsFileValuesIntoWhatTheDefinitionExpects) {
     };
     Case cases[] = {
         {Bits("0001001000110100"), "HV", "9:1234"},
-        {Bits("101"), "hv", "9:5"},  // padded to whole digits; any case
+        {Bits("101"), "hv", "9:5"},   // padded to whole digits; any case
         {Bits("1x01"), "HV", "9:9"},  // unknown bits count as 0
         {Bits("10x1"), "BV", "9:10x1"},
         {Bits("101"), "I", "3:5"},
