@@ -36,6 +36,7 @@ test: deps
 
 bench: build
 	@bash bench/run.sh $(BUILD)
+	@bash bench/run_program.sh $(BUILD) --yosys
 
 format:
 	clang-format -i host/*.h host/*.cpp s/*.h s/*.cpp apps/*.cpp apps/common/* tests/unit/*.cpp tests/unit/*/*.cpp 2>/dev/null || true

@@ -40,8 +40,11 @@ void FormatInto(std::string& out, const char* format, va_list args) {
     }
 }
 
-int Lower(int c) {
-    return std::tolower(static_cast<unsigned char>(c));
+// ASCII case folding: names compare the same whatever the locale, and
+// this runs on hot lookup paths.
+inline int Lower(int c) {
+    const unsigned char u = static_cast<unsigned char>(c);
+    return u >= 'A' && u <= 'Z' ? u + ('a' - 'A') : u;
 }
 
 }  // namespace

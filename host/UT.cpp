@@ -6,8 +6,11 @@
 
 namespace {
 
-int Lower(char c) {
-    return std::tolower(static_cast<unsigned char>(c));
+// ASCII case folding: names compare the same whatever the locale, and
+// this runs on hot lookup paths.
+inline int Lower(char c) {
+    const unsigned char u = static_cast<unsigned char>(c);
+    return u >= 'A' && u <= 'Z' ? u + ('a' - 'A') : u;
 }
 
 const char* OrEmpty(const char* s) {

@@ -1,4 +1,5 @@
 // Identifier text: reserved words, escaping, bus ranges and bus indexes.
+#include <charconv>
 #include <string>
 
 #include "../host/Nlw_Nl.h"
@@ -43,12 +44,27 @@ std::string& ResultBuffer(int which) {
 
 enum { kEscapeBuffer = 0, kRangeBuffer = 1, kIndexesBuffer = 2 };
 
-bool IsSimpleIdentifier(const std::string& name) {
-    for (size_t i = 0; i < name.size(); ++i) {
+bool IsSimpleIdentifier(const char* name) {
+    for (size_t i = 0; name[i] != '\0'; ++i) {
         if (!Nlw_Verilog::IsSimpleIdentifierChar(static_cast<unsigned char>(name[i]), i == 0))
             return false;
     }
     return true;
+}
+
+
+// Makes buffer "\name " in place, so that earlier results keep reading the
+// buffer; name may itself point into the buffer.
+void AssignEscaped(std::string& buffer, const char* name) {
+    const char* begin = buffer.data();
+    if (name >= begin && name <= begin + buffer.size()) {
+        const std::string copy(name);
+        AssignEscaped(buffer, copy.c_str());
+        return;
+    }
+    buffer.assign(1, '\\');
+    buffer += name;
+    buffer += ' ';
 }
 
 }  // namespace
@@ -60,7 +76,9 @@ const char** Nlw_Verilog::GetReservedWords() {
 // An escaped name begins with a backslash and ends with a space, or with a
 // space followed by a bracketed bus index.
 unsigned char Nlw_Verilog::IsEscaped(const char* name) {
-    if (name == nullptr) return 0;
+    // Only a name that starts with a backslash can match; most names do not,
+    // and this runs for every name written.
+    if (name == nullptr || name[0] != '\\') return 0;
     return UT_STR::IMatch(name, "\\* ") != 0 || UT_STR::IMatch(name, "\\* [*]") != 0;
 }
 
@@ -70,27 +88,29 @@ const char* Nlw_Verilog::Escape(const char* name, unsigned char isBused) {
         result.clear();
         return result.c_str();
     }
-    // Work on a copy: the name may be a result of an earlier call that lives
-    // in the buffer itself.
-    std::string candidate = name;
-    DARRAY_Util_INT32 indexes;
-    bool isBusBit = false;
-    if (isBused) {
-        std::string base;
-        if (Nlw_NlBus::IsBusName(name, base, &indexes)) {
-            isBusBit = true;
-            candidate.swap(base);
-        }
+    if (!isBused) {
+        // The common case: no bus index to split off, so the name is tested
+        // in place (it may be an earlier result living in the buffer itself,
+        // which std::string::assign handles).
+        if (this->IsEscaped(name)) return name;
+        if (IsSimpleIdentifier(name))
+            result.assign(name);
+        else
+            AssignEscaped(result, name);
+        return result.c_str();
     }
-    if (this->IsEscaped(candidate.c_str())) return name;
+    // The base part of a bus-bit name goes to a working buffer of its own;
+    // like the result, it is reused by every call.
+    static std::string base;
+    static DARRAY_Util_INT32 indexes;
+    const bool isBusBit = Nlw_NlBus::IsBusName(name, base, &indexes);
+    const char* candidate = isBusBit ? base.c_str() : name;
+    if (this->IsEscaped(candidate)) return name;
 
-    if (IsSimpleIdentifier(candidate)) {
-        result = candidate;
-    } else {
-        result = "\\";
-        result += candidate;
-        result += ' ';
-    }
+    if (IsSimpleIdentifier(candidate))
+        result.assign(candidate);
+    else
+        AssignEscaped(result, candidate);
     if (isBusBit) result += this->GetIndexesString(&indexes);
     return result.c_str();
 }
@@ -124,7 +144,15 @@ const char* Nlw_Verilog::GetIndexesString(DARRAY_Util_INT32* indexes) {
     const char left = Nlw_NlBus::GetLeftDelimiter(type);
     const char right = Nlw_NlBus::GetRightDelimiter(type);
     result.clear();
-    for (size_t i = 0; i < indexes->GetCount(); ++i)
-        Port_AppendFormat(result, "%c%d%c", left, static_cast<int>((*indexes)[i]), right);
+    // Written for every bus bit of every port map: appended directly rather
+    // than formatted.
+    char digits[16];
+    for (size_t i = 0; i < indexes->GetCount(); ++i) {
+        const std::to_chars_result end =
+            std::to_chars(digits, digits + sizeof digits, static_cast<int>((*indexes)[i]));
+        result += left;
+        result.append(digits, end.ptr);
+        result += right;
+    }
     return result.c_str();
 }

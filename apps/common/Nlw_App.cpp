@@ -1,5 +1,6 @@
 #include "Nlw_App.h"
 
+#include <chrono>
 #include <cstdio>
 #include <cstdlib>
 #include <memory>
@@ -50,6 +51,30 @@ std::string ResolveInput(const std::string& name) {
     return name;
 }
 
+// Traces how long each stage of the run took (debug channel).
+class StageClock {
+public:
+    void Trace(const char* stage) {
+        auto now = std::chrono::steady_clock::now();
+        Port_MsgManData::debugStub("%s took %.3f s\n", stage,
+                                   std::chrono::duration<double>(now - last_).count());
+        last_ = now;
+    }
+
+private:
+    std::chrono::steady_clock::time_point last_ = std::chrono::steady_clock::now();
+};
+
+// The design model of the last run. It is deliberately not freed when the
+// run ends: releasing a model of a million blocks object by object takes
+// longer than the operating system needs to reclaim the whole process. The
+// pointer keeps it reachable for leak checkers; a later run in the same
+// process frees the previous model first.
+std::unique_ptr<Nlw_NlView>& KeptView() {
+    static auto* kept = new std::unique_ptr<Nlw_NlView>();
+    return *kept;
+}
+
 }  // namespace
 
 int Nlw_RunProgram(Nlw_Program program, int argc, const char* const* argv) {
@@ -86,12 +111,15 @@ int Nlw_RunProgram(Nlw_Program program, int argc, const char* const* argv) {
     std::string input = ResolveInput(params.GetInputFileName());
     params.SetInputFileName(input.c_str());
 
-    Nlw_NlView view;
+    KeptView().reset(new Nlw_NlView);
+    Nlw_NlView& view = *KeptView();
     std::unique_ptr<Nlw_Design> design;
     Nlw_ReadOptions readOptions;
     readOptions.flatten = params.GetFlatten();
     msg.issueStatus("Reading design file '%s' ...\n", input.c_str());
+    StageClock clock;
     if (!Nlw_JsonReader::Load(input.c_str(), readOptions, view, design)) return 2;
+    clock.Trace("Reading the design");
     if (params.GetTopModuleName() && view.GetRootMacro())
         view.GetRootMacro()->GetType()->SetName(view.Intern(params.GetTopModuleName()));
 
@@ -102,7 +130,9 @@ int Nlw_RunProgram(Nlw_Program program, int argc, const char* const* argv) {
     std::unique_ptr<Ldm_TypeLib> typeLib(Nlw_Prep::LoadInstallationData(writer));
     writer.SetTypeLib(typeLib.get());
     Nlw_Prep::PrepareProperties(writer);
+    clock.Trace("Preparing the properties");
     writer.WriteDesign();
+    clock.Trace("Writing");
 
     int errors = messages.GetCount(Port_MsgLevel::Error) + messages.GetCount(Port_MsgLevel::Internal);
     messages.CloseLog();
