@@ -140,3 +140,12 @@ PM_PIC* Nlw_Util::CreatePicSpec(Nlw_NlView* view, bool flag) {
     if (!part) return nullptr;
     return new PM_PIC(part, flag, PM_PARTNAME_DEFAULT);
 }
+
+std::string Nlw_Util::CommentText(const char* text) {
+    std::string out = text ? text : "";
+    for (char& c : out) {
+        const unsigned char u = static_cast<unsigned char>(c);
+        if ((u < ' ' && u != '\t') || u == 0x7f) c = ' ';
+    }
+    return out;
+}

@@ -62,6 +62,10 @@ public:
     static int32_t GetInt32Prop(const Vdm_PropertyHolder* h, const char* name, int32_t dflt = 0);
     // The text of a string property, or null.
     static const char* GetStringProp(const Vdm_PropertyHolder* h, const char* name);
+    // Text as it may stand in a "//" comment: null gives "", and a line
+    // break or other control character (a tab aside) becomes a blank, so the
+    // comment cannot end early and put the rest of the text into the code.
+    static std::string CommentText(const char* text);
     // "INPUT", "OUTPUT", "BIDIR" or "UNKNOWN".
     static const char* ToString(int direction);
     // The part of the view as device data, or null when the view has none.

@@ -6,6 +6,7 @@
 
 #include "../host/Nlw_Nl.h"
 #include "../host/Nlw_Params.h"
+#include "../host/Nlw_Util.h"
 #include "../host/PM.h"
 #include "../host/Port.h"
 #include "../host/UT.h"
@@ -123,11 +124,7 @@ bool Nlw_VerilogWriter::IsBlackBoxMode() const {
 void Nlw_VerilogWriter::AppendAkaComment(std::string& out, const char* aka) const {
     if (!aka || !GetParams()->GetWriteAka()) return;
     out += " // AKA:";
-    size_t start = out.size();
-    out += aka;
-    for (size_t i = start; i < out.size(); ++i) {
-        if (out[i] == '\n' || out[i] == '\r') out[i] = ' ';
-    }
+    out += Nlw_Util::CommentText(aka);
 }
 
 void Nlw_VerilogWriter::WriteView(Nlw_NlView* view, unsigned char /*flag*/) {

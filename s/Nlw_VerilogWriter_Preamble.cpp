@@ -82,15 +82,18 @@ void Nlw_VerilogWriter::WriteNewHeader(Nlw_NlBlock* block) {
     WriteL("//");
 
     WriteL(kSeparator);
-    WriteL(vorform("// Command\t: %s", OrEmpty(params->GetCommandLine())));
-    WriteL(vorform("// Device\t: %s", OrEmpty(view ? view->GetDeviceInfo() : nullptr)));
-    WriteL(vorform("// Input file\t: %s", OrEmpty(params->GetInputFileName())));
-    WriteL(vorform("// Output file\t: %s", OrEmpty(params->GetOutputFileName())));
+    WriteL(vorform("// Command\t: %s", Nlw_Util::CommentText(params->GetCommandLine()).c_str()));
+    WriteL(vorform("// Device\t: %s",
+                   Nlw_Util::CommentText(view ? view->GetDeviceInfo() : nullptr).c_str()));
+    WriteL(
+        vorform("// Input file\t: %s", Nlw_Util::CommentText(params->GetInputFileName()).c_str()));
+    WriteL(vorform("// Output file\t: %s",
+                   Nlw_Util::CommentText(params->GetOutputFileName()).c_str()));
     WriteL(vorform("// # of Modules\t: %d", view ? static_cast<int>(view->GetNumMacros()) : 0));
-    WriteL(vorform("// Design Name\t: %s", DesignName(nlw)));
+    WriteL(vorform("// Design Name\t: %s", Nlw_Util::CommentText(DesignName(nlw)).c_str()));
     if (block && block->GetParent())
-        WriteL(vorform("// Module Name: %s", OrEmpty(block->GetTypeName())));
-    WriteL(vorform("// Vornix        : %s", OrEmpty(params->GetVornix())));
+        WriteL(vorform("// Module Name: %s", Nlw_Util::CommentText(block->GetTypeName()).c_str()));
+    WriteL(vorform("// Vornix        : %s", Nlw_Util::CommentText(params->GetVornix()).c_str()));
     WriteL(kSeparator);
     WriteL("// Purpose:    ");
 
@@ -208,8 +211,9 @@ void Nlw_VerilogWriter::WriteMHHeader(Nlw_NlBlock* block) {
     WriteL("// This netlist is one of multiple netlists created for the");
     WriteL("// design using tessel's write multiple hierarchy files option.");
     WriteL("");
-    WriteL(vorform("// Design name : %s", DesignName(nlw)));
-    WriteL(vorform("// Module name : %s", OrEmpty(block ? block->GetTypeName() : nullptr)));
+    WriteL(vorform("// Design name : %s", Nlw_Util::CommentText(DesignName(nlw)).c_str()));
+    WriteL(vorform("// Module name : %s",
+                   Nlw_Util::CommentText(block ? block->GetTypeName() : nullptr).c_str()));
     WriteL("");
 
     if (params->GetEcnMode()) {

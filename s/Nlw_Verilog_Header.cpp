@@ -1,15 +1,12 @@
 // The stock netlist head, the run-parameter block and the closing notices.
 #include "../host/Nlw_Nl.h"
+#include "../host/Nlw_Util.h"
 #include "../host/Nlw_Writer.h"
 #include "../host/Port.h"
 #include "../host/UT.h"
 #include "Nlw_Verilog.h"
 
 namespace {
-
-const char* Text(const char* s) {
-    return s ? s : "";
-}
 
 // A global signal makes the chipwide module necessary when nothing in the
 // design drives it and it stands for no pin: the chipwide module then
@@ -103,13 +100,18 @@ void Nlw_Verilog::WriteParams(Nlw_Writer* writer) {
     Nlw_NlView* view = GetView();
     const int numModules = view ? static_cast<int>(view->GetNumMacros()) : 0;
     const char* device = view ? view->GetDeviceInfo() : nullptr;
-    writer->WriteL(vorform("// Command      : %s", Text(params->GetCommandLine())));
-    writer->WriteL(vorform("// Input file   : %s", Text(params->GetInputFileName())));
-    writer->WriteL(vorform("// Output file  : %s", Text(params->GetOutputFileName())));
-    writer->WriteL(vorform("// Design name  : %s", GetDesignName()));
+    writer->WriteL(
+        vorform("// Command      : %s", Nlw_Util::CommentText(params->GetCommandLine()).c_str()));
+    writer->WriteL(
+        vorform("// Input file   : %s", Nlw_Util::CommentText(params->GetInputFileName()).c_str()));
+    writer->WriteL(vorform("// Output file  : %s",
+                           Nlw_Util::CommentText(params->GetOutputFileName()).c_str()));
+    writer->WriteL(vorform("// Design name  : %s", Nlw_Util::CommentText(GetDesignName()).c_str()));
     writer->WriteL(vorform("// # of Modules : %d", numModules));
-    writer->WriteL(vorform("// Vornix       : %s", Text(params->GetVornix())));
-    writer->WriteL(vorform("// Device       : %s", device ? device : "NULL"));
+    writer->WriteL(
+        vorform("// Vornix       : %s", Nlw_Util::CommentText(params->GetVornix()).c_str()));
+    writer->WriteL(
+        vorform("// Device       : %s", device ? Nlw_Util::CommentText(device).c_str() : "NULL"));
     writer->WriteL("");
 }
 

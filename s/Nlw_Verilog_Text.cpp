@@ -52,7 +52,6 @@ bool IsSimpleIdentifier(const char* name) {
     return true;
 }
 
-
 // Makes buffer "\name " in place, so that earlier results keep reading the
 // buffer; name may itself point into the buffer.
 void AssignEscaped(std::string& buffer, const char* name) {

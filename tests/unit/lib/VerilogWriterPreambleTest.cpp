@@ -32,6 +32,18 @@ protected:
     Nlw_NlBlock* top_ = nullptr;
 };
 
+// Header fields are user texts inside "//" comments: a line break in one
+// must not push the rest of the text out of the comment.
+TEST_F(VerilogWriterPreamble, LineBreaksInHeaderFieldsStayInsideTheComment) {
+    params_.SetCommandLine("qdb2ver \"a\nmodule evil;\" top.qdb");
+    params_.SetInputFileName("dir\r\nx.qdb");
+    const std::string text = View();
+    EXPECT_NE(text.find("// Command\t: qdb2ver \"a module evil;\" top.qdb\n"), std::string::npos)
+        << text;
+    EXPECT_NE(text.find("// Input file\t: dir  x.qdb\n"), std::string::npos) << text;
+    EXPECT_EQ(text.find("\nmodule evil"), std::string::npos);
+}
+
 TEST_F(VerilogWriterPreamble, SingleFileHead) {
     EXPECT_EQ(View(),
               "////////////////////////////////////////////////////////////////////////////////\n"
