@@ -15,43 +15,14 @@
 #include "Nlw_NetlistWriter.h"
 #include "Nlw_Writer.h"
 #include "Port.h"
+#include "TestFiles.h"
 
 namespace hosttest {
 
-// A fresh directory below the system's temporary directory, removed with
-// everything in it when the object goes.
-class TempDir {
-public:
-    TempDir() {
-        char tmpl[] = "/tmp/nlw_host_test_XXXXXX";
-        const char* made = ::mkdtemp(tmpl);
-        EXPECT_NE(made, nullptr);
-        path_ = made ? made : "/tmp";
-    }
-    ~TempDir() { std::system(("rm -rf '" + path_ + "'").c_str()); }
-    const std::string& path() const { return path_; }
-    std::string operator/(const std::string& name) const { return path_ + "/" + name; }
-
-private:
-    std::string path_;
-};
-
-inline void WriteFile(const std::string& path, const std::string& text) {
-    std::ofstream out(path, std::ios::binary);
-    out << text;
-}
-
-inline std::string ReadFile(const std::string& path) {
-    std::ifstream in(path, std::ios::binary);
-    std::stringstream s;
-    s << in.rdbuf();
-    return s.str();
-}
-
-inline bool Exists(const std::string& path) {
-    struct stat st;
-    return ::stat(path.c_str(), &st) == 0;
-}
+using nlwtest::Exists;
+using nlwtest::ReadFile;
+using nlwtest::TempDir;
+using nlwtest::WriteFile;
 
 inline void MakeDirs(const std::string& path) {
     std::system(("mkdir -p '" + path + "'").c_str());

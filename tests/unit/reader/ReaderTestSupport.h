@@ -16,38 +16,14 @@
 #include "Nlw_JsonReader.h"
 #include "Nlw_Nl.h"
 #include "Port.h"
+#include "TestFiles.h"
 
 namespace readertest {
 
-class TempDir {
-public:
-    TempDir() {
-        char tmpl[] = "/tmp/nlw_reader_test_XXXXXX";
-        const char* made = ::mkdtemp(tmpl);
-        EXPECT_NE(made, nullptr);
-        path_ = made ? made : "/tmp";
-    }
-    ~TempDir() { std::system(("rm -rf '" + path_ + "'").c_str()); }
-    TempDir(const TempDir&) = delete;
-    TempDir& operator=(const TempDir&) = delete;
-    const std::string& path() const { return path_; }
-    std::string operator/(const std::string& name) const { return path_ + "/" + name; }
-
-private:
-    std::string path_;
-};
-
-inline void WriteFile(const std::string& path, const std::string& text) {
-    std::ofstream out(path, std::ios::binary);
-    out << text;
-}
-
-inline std::string ReadFile(const std::string& path) {
-    std::ifstream in(path, std::ios::binary);
-    std::stringstream ss;
-    ss << in.rdbuf();
-    return ss.str();
-}
+using nlwtest::Exists;
+using nlwtest::ReadFile;
+using nlwtest::TempDir;
+using nlwtest::WriteFile;
 
 // An installation root of the test's own, with the data files given (a
 // name and its text each), made the only installation while it lives.
