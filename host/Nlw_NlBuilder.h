@@ -94,8 +94,16 @@ struct Nlw_NlArena {
     size_t GetBytes() const { return bytes_; }
 
 private:
-    static constexpr size_t kChunk = size_t(1) << 20;
-    std::vector<std::unique_ptr<char[]>> chunks_;
+    // Chunks are huge-page sized and aligned, and the kernel is asked to back
+    // them with huge pages: a large design touches hundreds of megabytes of
+    // fresh memory, and the page faults would otherwise cost about as much
+    // as building the model.
+    static constexpr size_t kChunk = size_t(2) << 20;
+    struct FreeChunk {
+        void operator()(char* p) const;
+    };
+    static char* NewChunk(size_t size);
+    std::vector<std::unique_ptr<char, FreeChunk>> chunks_;
     char* cur_ = nullptr;
     size_t left_ = 0;
     size_t bytes_ = 0;

@@ -1,8 +1,23 @@
 // The view: storage of every model object, type lookup and destruction.
+#include <sys/mman.h>
+
+#include <cstdlib>
 #include <cstring>
 #include <new>
 
 #include "Nlw_NlBuilder.h"
+
+void Nlw_NlArena::FreeChunk::operator()(char* p) const { std::free(p); }
+
+char* Nlw_NlArena::NewChunk(size_t size) {
+    const size_t rounded = (size + kChunk - 1) / kChunk * kChunk;
+    void* p = std::aligned_alloc(kChunk, rounded);
+    if (p == nullptr) throw std::bad_alloc();
+#ifdef MADV_HUGEPAGE
+    ::madvise(p, rounded, MADV_HUGEPAGE);  // advice only: failure changes nothing
+#endif
+    return static_cast<char*>(p);
+}
 
 void* Nlw_NlArena::Allocate(size_t size, size_t align) {
     if (size == 0) size = 1;
@@ -10,7 +25,7 @@ void* Nlw_NlArena::Allocate(size_t size, size_t align) {
     // A large request gets a chunk of its own so that the current chunk's
     // remainder is not wasted.
     if (size > kChunk / 4) {
-        chunks_.emplace_back(new char[size + align]);
+        chunks_.emplace_back(NewChunk(size + align));
         char* p = chunks_.back().get();
         const uintptr_t misalign = reinterpret_cast<uintptr_t>(p) % align;
         return misalign ? p + (align - misalign) : p;
@@ -18,7 +33,7 @@ void* Nlw_NlArena::Allocate(size_t size, size_t align) {
     uintptr_t pad = reinterpret_cast<uintptr_t>(cur_) % align;
     if (pad) pad = align - pad;
     if (cur_ == nullptr || left_ < size + pad) {
-        chunks_.emplace_back(new char[kChunk]);
+        chunks_.emplace_back(NewChunk(kChunk));
         cur_ = chunks_.back().get();
         left_ = kChunk;
         pad = reinterpret_cast<uintptr_t>(cur_) % align;
