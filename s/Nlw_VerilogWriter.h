@@ -85,7 +85,9 @@ private:
     void WriteWireDeclarations(Nlw_NlBlock* block);
     void WriteWireAssignments(Nlw_NlBlock* block);
     void WriteComponentInstantiationStatements(Nlw_NlBlock* block);
-    void WritePortMaps(Nlw_NlBlock* instance);
+    // written: connection lines already begun before the port map (bit-init
+    // lines), which the separator rule continues.
+    void WritePortMaps(Nlw_NlBlock* instance, int written = 0);
     void ApplyBigEndingOrder(Nlw_NlBlock* instance);
     // Tables.
     void InitHexStringPropertyTable();

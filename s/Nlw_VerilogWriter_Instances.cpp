@@ -45,7 +45,11 @@ void Nlw_VerilogWriter::WriteComponentInstantiationStatements(Nlw_NlBlock* block
             WriteIL(line_.c_str());
 
         UpIndent();
-        // Constant inputs of the cell: the last character drives I0.
+        // Constant inputs of the cell: the last character drives I0. Each
+        // line but the last ends with its comma at once; the last one gets
+        // its comma only when a port connection follows, so that an instance
+        // without connections does not end its list with a comma.
+        int connections = 0;
         if (Vdm_Property* bitInit = child->GetPropertyByName("NLW_BIT_INIT")) {
             const char* bits = bitInit->GetString();
             const size_t length = bits ? std::strlen(bits) : 0;
@@ -54,11 +58,15 @@ void Nlw_VerilogWriter::WriteComponentInstantiationStatements(Nlw_NlBlock* block
                 AppendInt(line_, static_cast<long>(i));
                 line_ += "(1'b";
                 line_ += bits[length - 1 - i];
-                line_ += "),";
-                WriteIL(line_.c_str());
+                line_ += i + 1 < length ? ")," : ")";
+                if (i + 1 < length)
+                    WriteIL(line_.c_str());
+                else
+                    WriteI(line_.c_str());
+                ++connections;
             }
         }
-        WritePortMaps(child);
+        WritePortMaps(child, connections);
         DownIndent();
         WriteIL(");");
     }
@@ -81,9 +89,9 @@ void Nlw_VerilogWriter::ApplyBigEndingOrder(Nlw_NlBlock* instance) {
     }
 }
 
-void Nlw_VerilogWriter::WritePortMaps(Nlw_NlBlock* instance) {
+void Nlw_VerilogWriter::WritePortMaps(Nlw_NlBlock* instance, int written) {
     Nlw_NetlistWriter* nlw = GetNlw();
-    int count = 0;
+    int count = written;
     auto separator = [&]() {
         if (count++ > 0) WriteL(",");
     };

@@ -91,7 +91,12 @@ const char* Nlw_Verilog::Escape(const char* name, unsigned char isBused) {
         // The common case: no bus index to split off, so the name is tested
         // in place (it may be an earlier result living in the buffer itself,
         // which std::string::assign handles).
-        if (this->IsEscaped(name)) return name;
+        if (this->IsEscaped(name)) {
+            // Every call takes the buffer over, this one included: a result
+            // kept from an earlier call now reads the name given.
+            result.assign(name);
+            return name;
+        }
         if (IsSimpleIdentifier(name))
             result.assign(name);
         else
@@ -104,7 +109,10 @@ const char* Nlw_Verilog::Escape(const char* name, unsigned char isBused) {
     static DARRAY_Util_INT32 indexes;
     const bool isBusBit = Nlw_NlBus::IsBusName(name, base, &indexes);
     const char* candidate = isBusBit ? base.c_str() : name;
-    if (this->IsEscaped(candidate)) return name;
+    if (this->IsEscaped(candidate)) {
+        result.assign(name);
+        return name;
+    }
 
     if (IsSimpleIdentifier(candidate))
         result.assign(candidate);

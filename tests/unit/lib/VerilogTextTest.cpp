@@ -54,6 +54,17 @@ TEST_F(VerilogText, ConsecutiveResultsShareOneBuffer) {
     EXPECT_STREQ(first, "\\c-d ");
 }
 
+// A name that is escaped already comes back as the caller's pointer, yet the
+// call still takes the buffer over like any other.
+TEST_F(VerilogText, EscapedNamesTakeTheBufferOverToo) {
+    for (const unsigned char isBused : {0, 1}) {
+        const char* first = nlw.Escape("a-b", 0);
+        const char* escaped = "\\x y [2]";
+        EXPECT_EQ(nlw.Escape(escaped, isBused), escaped);
+        EXPECT_STREQ(first, escaped) << int(isBused);
+    }
+}
+
 TEST_F(VerilogText, LongNamesSurviveWhole) {
     const std::string plain(5000, 'n');
     EXPECT_EQ(nlw.Escape(plain.c_str(), 0), plain);

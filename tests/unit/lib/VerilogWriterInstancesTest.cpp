@@ -101,13 +101,31 @@ TEST_F(VerilogWriterInstances, BitInitDrivesInputsLastCharacterFirst) {
 )");
 }
 
+// Without any port connection after them the bit-init lines must not end
+// the list with a comma.
+TEST_F(VerilogWriterInstances, BitInitWithoutConnectionsEndsWithoutComma) {
+    Nlw_NlType* lut = b_.AddLibraryType("V_LUT2", true, false);
+    b_.AddTypePin(lut, "I0", NLW_DIR_INPUT);
+    b_.AddTypePin(lut, "I1", NLW_DIR_INPUT);
+    Nlw_NlBlock* u = b_.CreateLeaf(top_, lut, "u");
+    u->AddProperty(Vdm_Property::NewString("NLW_BIT_INIT", "10"));
+    EXPECT_EQ(Instances(), R"(  V_LUT2   u (
+    .I0(1'b0),
+    .I1(1'b1)
+  );
+)");
+}
+
 TEST_F(VerilogWriterInstances, BigEndingCellsConnectLeastSignificantBitFirst) {
     // The keys match type names ignoring case; a value naming the key itself
     // means every bus.
-    root_.File("data/vdm2ver.acd", "BigEndingTimcell = v_ram, V_ROM:addr\n");
+    // Entries of one type under keys of different case all apply.
+    root_.File("data/vdm2ver.acd",
+               "BigEndingTimcell = v_ram, V_ROM:addr, V_DUAL:ADDR, v_dual:data\n");
     Memory("V_RAM", "r");
     Memory("V_ROM", "m");
     Memory("V_REG", "g");
+    Memory("V_Dual", "x");
     EXPECT_EQ(Instances(), R"(  V_RAM   r (
     .ADDR({a[0], a[1]}),
     .DATA({d[0], d[1]})
@@ -119,6 +137,10 @@ TEST_F(VerilogWriterInstances, BigEndingCellsConnectLeastSignificantBitFirst) {
   V_REG   g (
     .ADDR({a[1], a[0]}),
     .DATA({d[1], d[0]})
+  );
+  V_Dual   x (
+    .ADDR({a[0], a[1]}),
+    .DATA({d[0], d[1]})
   );
 )");
 }
