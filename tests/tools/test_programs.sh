@@ -63,6 +63,10 @@ for f in top flat; do
     expect "yosys reads $f.v" 0 yosys -q -p "read_verilog $work/$f.v; hierarchy -top top"
 done
 
+cp "$work/top.v" "$work/first.v"
+expect "a second run: exit 0" 0 "$bin/qdb2ver" -w "$work/top.json"
+if cmp -s "$work/top.v" "$work/first.v"; then echo "ok   the same design gives the same bytes"; else echo "FAIL two runs differ"; fail=1; fi
+
 expect "-tm renames the top module" 0 "$bin/qdb2ver" -w -tm chip "$work/top.json" "$work/chip.v"
 contains "the module is named chip" "$work/chip.v" "module chip"
 exit $fail
