@@ -43,10 +43,9 @@ TEST_F(PortMsg, CountsPerLevelAndCapturesText) {
           Port_MsgLevel::Error, Port_MsgLevel::Internal})
         EXPECT_EQ(m.GetCount(level), 1) << static_cast<int>(level);
     ASSERT_EQ(capture.msgs.size(), 6u);
-    EXPECT_EQ(capture.msgs[0].level, Port_MsgLevel::Status);
     EXPECT_EQ(capture.msgs[0].domain, "NetListWriters");
-    EXPECT_EQ(capture.msgs[0].text, "Writing Verilog netlist file 'top.v' ...\n");
-    EXPECT_EQ(capture.Texts(Port_MsgLevel::Info), std::vector<std::string>{"1 notice"});
+    EXPECT_EQ(capture.Texts(Port_MsgLevel::Status),
+              std::vector<std::string>{"Writing Verilog netlist file 'top.v' ...\n"});
     EXPECT_EQ(capture.Texts(Port_MsgLevel::Warning),
               std::vector<std::string>{"Padding or triming the value for hex property INIT:\n"});
     // Debug traces reach capture sinks even with debug output off.
@@ -54,18 +53,14 @@ TEST_F(PortMsg, CountsPerLevelAndCapturesText) {
               std::vector<std::string>{"Adding (A:B) to the recursive inclusion map.\n"});
     m.ResetCounts();
     EXPECT_EQ(m.GetCount(Port_MsgLevel::Error), 0);
-}
-
-TEST_F(PortMsg, CaptureEndsWithItsLifetime) {
-    Port_MsgManager::Instance().SetConsole(false);
-    Port_MsgCapture outer;
+    // A capture ends with its lifetime.
     {
         Port_MsgCapture inner;
         NLW_MSG().issueWarning("both\n");
         EXPECT_EQ(inner.msgs.size(), 1u);
     }
     NLW_MSG().issueWarning("outer only\n");
-    EXPECT_EQ(outer.msgs.size(), 2u);
+    EXPECT_EQ(capture.msgs.size(), 8u);
 }
 
 TEST_F(PortMsg, ConsolePresentation) {
@@ -124,17 +119,14 @@ TEST_F(PortMsg, LogFileGetsEverything) {
     EXPECT_FALSE(m.OpenLog((dir / "no/such/dir/run.log").c_str()));
 }
 
-TEST_F(PortMsg, LongMessagesAreWhole) {
+TEST_F(PortMsg, LongMessagesAreWholeAndLeaveVorformAlone) {
     Port_MsgManager::Instance().SetConsole(false);
     Port_MsgCapture capture;
     std::string big(100000, 'm');
     NLW_MSG().issueError("Cannot write file '%s': %s\n", big.c_str(), "reason");
     ASSERT_EQ(capture.msgs.size(), 1u);
     EXPECT_EQ(capture.msgs[0].text, "Cannot write file '" + big + "': reason\n");
-}
-
-TEST_F(PortMsg, IssuingLeavesVorformResultsAlone) {
-    Port_MsgManager::Instance().SetConsole(false);
+    // Issuing leaves results of vorform alone.
     const char* held = vorform("held %d", 7);
     for (int i = 0; i < 20; ++i) NLW_MSG().issueInfo("%s %d", "info", i);
     EXPECT_STREQ(held, "held 7");

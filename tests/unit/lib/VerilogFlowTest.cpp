@@ -1,45 +1,14 @@
 // The design write flow: legalizing, the netlist files of both modes and the
 // closing notices, observed through the files and messages a run leaves.
-#include <gtest/gtest.h>
-#include <stdlib.h>
-
 #include <algorithm>
-#include <filesystem>
-#include <string>
-#include <vector>
 
-#include "Nlw_NlBuilder.h"
 #include "Nlw_Nl_LU.h"
-#include "Nlw_Verilog.h"
+#include "VerilogWriterTest.h"
 
 namespace {
 
 namespace fs = std::filesystem;
-
-class ScopedEnv {
-public:
-    ScopedEnv(const char* name, const char* value) : name_(name) {
-        if (const char* old = getenv(name)) {
-            hadOld_ = true;
-            old_ = old;
-        }
-        if (value)
-            setenv(name, value, 1);
-        else
-            unsetenv(name);
-    }
-    ~ScopedEnv() {
-        if (hadOld_)
-            setenv(name_.c_str(), old_.c_str(), 1);
-        else
-            unsetenv(name_.c_str());
-    }
-
-private:
-    std::string name_;
-    std::string old_;
-    bool hadOld_ = false;
-};
+using vwtest::ScopedEnv;
 
 class VerilogFlow : public ::testing::Test {
 protected:
@@ -84,8 +53,7 @@ protected:
     ScopedEnv noCache{"NLW_NO_NAMECACHE", nullptr};
     ScopedEnv noBridge{"VOR_NLW_LU_NO_BRIDGEID", nullptr};
     ScopedEnv noDump{"NLW_WRITE_NLWFILE", nullptr};
-    std::string dir;
-    std::string output;
+    std::string dir, output;
     Nlw_Verilog nlw;
     Nlw_Params params;
     Nlw_NlView view;
@@ -108,6 +76,46 @@ TEST_F(VerilogFlow, SingleModeWritesTheNetlistThenTheNotices) {
     EXPECT_EQ(Nlw_NlBus::GetInputDelimiterType(), 4);
 }
 
+struct LegalizeCase {
+    const char* env;  // set while writing; null: none
+    bool escaped;
+    const char* spacedName;
+    const char* aka;  // null: none kept
+    const char* dashedName;
+};
+
+class VerilogFlowLegalize : public VerilogFlow,
+                            public ::testing::WithParamInterface<LegalizeCase> {};
+
+TEST_P(VerilogFlowLegalize, LegalizesNamesBeforeWritingAsTheSwitchesSay) {
+    const LegalizeCase& c = GetParam();
+    ScopedEnv set(c.env ? c.env : "NLW_NO_NAMECACHE", c.env ? "" : nullptr);
+    params.SetWriteEscapedNames(c.escaped);
+    nlw.WriteDesign();
+    const bool cache = !c.env || std::string(c.env) != "NLW_NO_NAMECACHE";
+    EXPECT_EQ(Nlw_Nl_SpkCache::IsBuilt(), cache);
+    if (cache) {
+        EXPECT_TRUE(Nlw_Nl_SpkCache::IsKeyword("specparam"));
+    }
+    EXPECT_STREQ(spaced->GetWritableName(), c.spacedName);
+    if (c.aka) {
+        ASSERT_NE(spaced->GetAka(), nullptr);
+        EXPECT_STREQ(spaced->GetAka(), c.aka);
+    } else {
+        EXPECT_EQ(spaced->GetAka(), nullptr);
+    }
+    EXPECT_STREQ(dashed->GetWritableName(), c.dashedName);
+    EXPECT_EQ(Files(), std::vector<std::string>{"top.v"});
+}
+
+// Names escaped when written are left alone.
+INSTANTIATE_TEST_SUITE_P(
+    Switches, VerilogFlowLegalize,
+    ::testing::Values(LegalizeCase{nullptr, true, "a_b", "a b", "c-d"},
+                      LegalizeCase{nullptr, false, "a_b", "a b", "c_d"},
+                      LegalizeCase{"NLW_NO_NAMECACHE", true, "a b", nullptr, "c-d"},
+                      LegalizeCase{"VOR_NLW_LU_NO_BRIDGEID", true, "a_b", nullptr, "c-d"}));
+
 TEST_F(VerilogFlow, DumpsTheHostNetlistWhenAsked) {
     {
         ScopedEnv set("NLW_WRITE_NLWFILE", "");
@@ -116,63 +124,29 @@ TEST_F(VerilogFlow, DumpsTheHostNetlistWhenAsked) {
     EXPECT_EQ(Files(), (std::vector<std::string>{"top.nlw", "top.v"}));
 }
 
-TEST_F(VerilogFlow, LegalizesNamesBeforeWriting) {
-    nlw.WriteDesign();
-    EXPECT_TRUE(Nlw_Nl_SpkCache::IsBuilt());
-    EXPECT_TRUE(Nlw_Nl_SpkCache::IsKeyword("specparam"));
-    EXPECT_STREQ(spaced->GetWritableName(), "a_b");
-    ASSERT_NE(spaced->GetAka(), nullptr);
-    EXPECT_STREQ(spaced->GetAka(), "a b");
-    // Escaped when written, so left alone.
-    EXPECT_STREQ(dashed->GetWritableName(), "c-d");
-}
-
-TEST_F(VerilogFlow, LegalizesEveryCharacterWhenNamesAreNotEscaped) {
-    params.SetWriteEscapedNames(false);
-    nlw.WriteDesign();
-    EXPECT_STREQ(spaced->GetWritableName(), "a_b");
-    EXPECT_STREQ(dashed->GetWritableName(), "c_d");
-}
-
-TEST_F(VerilogFlow, NoNameCacheSkipsKeywordsAndLegalizer) {
-    ScopedEnv set("NLW_NO_NAMECACHE", "");
-    nlw.WriteDesign();
-    EXPECT_FALSE(Nlw_Nl_SpkCache::IsBuilt());
-    EXPECT_STREQ(spaced->GetWritableName(), "a b");
-    EXPECT_EQ(Files(), std::vector<std::string>{"top.v"});
-}
-
-TEST_F(VerilogFlow, NoBridgeIdKeepsNoOriginalName) {
-    ScopedEnv set("VOR_NLW_LU_NO_BRIDGEID", "");
-    nlw.WriteDesign();
-    EXPECT_STREQ(spaced->GetWritableName(), "a_b");
-    EXPECT_EQ(spaced->GetAka(), nullptr);
-}
-
 TEST_F(VerilogFlow, MultipleHierarchyWritesOneFilePerModuleType) {
     params.SetMHFMode(true);
-    Port_MsgCapture capture;
-    nlw.WriteDesign();
-    // The descending walk meets u2 (SUB) before u1 (sub), which then writes
-    // nothing; the chipwide file is always written.
-    EXPECT_EQ(Files(), (std::vector<std::string>{"SUB.v", "chipwide.v", "top.v"}));
-    EXPECT_GE(IndexOf(capture, "Writing multiple Verilog netlists for design 'demo' ...\n"), 0);
-    for (const std::string& text : capture.Texts(Port_MsgLevel::Status))
-        EXPECT_EQ(text.find("Writing Verilog netlist file"), std::string::npos) << text;
-}
-
-TEST_F(VerilogFlow, MultipleHierarchyModelFileOnlyWhenAsked) {
-    params.SetMHFMode(true);
-    params.SetWriteInstantiatedTimcells(true);
-    Port_MsgCapture capture;
-    nlw.WriteDesign();
-    EXPECT_EQ(Files(), (std::vector<std::string>{"SUB.v", "chipwide.v", "top.v", "top_ism.v"}));
-    const int netlists =
-        IndexOf(capture, "Writing multiple Verilog netlists for design 'demo' ...\n");
-    const int models =
-        IndexOf(capture, "Writing Verilog simulation model file '" + dir + "/top_ism.v' ...\n");
-    EXPECT_GE(netlists, 0);
-    EXPECT_GT(models, netlists);
+    for (bool models : {false, true}) {
+        SCOPED_TRACE(models);
+        params.SetWriteInstantiatedTimcells(models);
+        Port_MsgCapture capture;
+        nlw.WriteDesign();
+        // The descending walk meets u2 (SUB) before u1 (sub), which then writes
+        // nothing; the chipwide file is always written.
+        std::vector<std::string> files = {"SUB.v", "chipwide.v", "top.v"};
+        if (models) files.push_back("top_ism.v");
+        EXPECT_EQ(Files(), files);
+        const int netlists =
+            IndexOf(capture, "Writing multiple Verilog netlists for design 'demo' ...\n");
+        EXPECT_GE(netlists, 0);
+        if (models) {
+            EXPECT_GT(IndexOf(capture, "Writing Verilog simulation model file '" + dir +
+                                           "/top_ism.v' ...\n"),
+                      netlists);
+        }
+        for (const std::string& text : capture.Texts(Port_MsgLevel::Status))
+            EXPECT_EQ(text.find("Writing Verilog netlist file"), std::string::npos) << text;
+    }
 }
 
 TEST_F(VerilogFlow, RequestsOfFilesWithoutWritersLeaveTheNetlistAlone) {

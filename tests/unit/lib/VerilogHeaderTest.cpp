@@ -1,16 +1,7 @@
 // The stock netlist head, the run-parameter block, the closing notices and
 // the output file names.
-#include <gtest/gtest.h>
-#include <stdlib.h>
-
-#include <filesystem>
-#include <fstream>
-#include <string>
-#include <vector>
-
-#include "Nlw_NlBuilder.h"
-#include "Nlw_Verilog.h"
 #include "Nlw_Writer.h"
+#include "VerilogWriterTest.h"
 
 // Reaches the writer object's private parts.
 struct Nlw_VerilogTestPeer {
@@ -64,28 +55,6 @@ const char* const kNoTimcells =
     "Timcell library directory not found, the `uselib constructis omitted for the -ul "
     "option.\n";
 
-// Sets VORNIX for one test and restores it.
-class ScopedVornix {
-public:
-    explicit ScopedVornix(const std::string& value) {
-        if (const char* old = getenv("VORNIX")) old_ = old;
-        hadOld_ = getenv("VORNIX") != nullptr;
-        setenv("VORNIX", value.c_str(), 1);
-        Port::VornixPath::Reset();
-    }
-    ~ScopedVornix() {
-        if (hadOld_)
-            setenv("VORNIX", old_.c_str(), 1);
-        else
-            unsetenv("VORNIX");
-        Port::VornixPath::Reset();
-    }
-
-private:
-    std::string old_;
-    bool hadOld_ = false;
-};
-
 class VerilogHeader : public ::testing::Test {
 protected:
     void SetUp() override {
@@ -93,16 +62,6 @@ protected:
         nlw.SetView(&view);
         nlw.SetDesign(&design);
         top = builder.CreateRoot(builder.AddModuleType("top"), "top");
-    }
-
-    void TearDown() override {
-        if (!tmp_.empty()) std::filesystem::remove_all(tmp_);
-    }
-
-    std::string TempDir() {
-        char pattern[] = "/tmp/nlw_header_XXXXXX";
-        tmp_ = mkdtemp(pattern);
-        return tmp_;
     }
 
     std::string Header() {
@@ -124,7 +83,6 @@ protected:
     Nlw_Design design{"demo"};
     Nlw_NlBuilder builder{&view};
     Nlw_NlBlock* top = nullptr;
-    std::string tmp_;
 };
 
 TEST_F(VerilogHeader, WritesTheDisclaimerOfTheMode) {
@@ -144,33 +102,28 @@ TEST_F(VerilogHeader, WritesTheDisclaimerOfTheMode) {
 }
 
 TEST_F(VerilogHeader, UselibNamesTheFirstRootHoldingTheTimcells) {
-    const std::string tmp = TempDir();
-    const std::string a = tmp + "/a", b = tmp + "/b", file = tmp + "/f";
-    std::filesystem::create_directories(a + "/verilog/src");
-    std::filesystem::create_directories(b + "/verilog/src/timcells");
-    std::ofstream(file) << "x";
-    ScopedVornix vornix(file + ":" + a + ":" + b + ":" + tmp + "/missing");
+    vwtest::TempDir tmp;
+    const std::string a = tmp.Dir("a/verilog/src"), b = tmp.Dir("b/verilog/src/timcells");
+    const std::string file = tmp.File("f", "x");
+    struct Case {
+        std::string roots;
+        std::string uselib;
+        std::vector<std::string> errors;
+    };
+    const Case cases[] = {
+        {file + ":" + tmp.Path() + "/a:" + tmp.Path() + "/b:" + tmp.Path() + "/missing",
+         "`uselib dir=" + b + " libext=.v\n",
+         {}},
+        {tmp.Path(), "", {kNoTimcells}},  // left out with an error
+        {"", "", {kNoVornix, kNoTimcells}},
+    };
     params.SetWriteUseLib(true);
-    Port_MsgCapture capture;
-    EXPECT_EQ(Header(), std::string(kSimBlock) + "`timescale 1 ns/1 ps\n`uselib dir=" + b +
-                            "/verilog/src/timcells libext=.v\n\n");
-    EXPECT_TRUE(capture.Texts(Port_MsgLevel::Error).empty());
-}
-
-TEST_F(VerilogHeader, UselibWithoutTimcellsIsLeftOutWithAnError) {
-    params.SetWriteUseLib(true);
-    {
-        ScopedVornix vornix(TempDir());
+    for (const Case& c : cases) {
+        vwtest::ScopedEnv vornix("VORNIX", c.roots.c_str());
         Port_MsgCapture capture;
-        EXPECT_EQ(Header(), std::string(kSimBlock) + "`timescale 1 ns/1 ps\n\n");
-        EXPECT_EQ(capture.Texts(Port_MsgLevel::Error), std::vector<std::string>{kNoTimcells});
-    }
-    {
-        ScopedVornix vornix("");
-        Port_MsgCapture capture;
-        EXPECT_EQ(Header(), std::string(kSimBlock) + "`timescale 1 ns/1 ps\n\n");
-        EXPECT_EQ(capture.Texts(Port_MsgLevel::Error),
-                  (std::vector<std::string>{kNoVornix, kNoTimcells}));
+        EXPECT_EQ(Header(), std::string(kSimBlock) + "`timescale 1 ns/1 ps\n" + c.uselib + "\n")
+            << c.roots;
+        EXPECT_EQ(capture.Texts(Port_MsgLevel::Error), c.errors) << c.roots;
     }
 }
 

@@ -24,21 +24,11 @@ const char* const kTessel =
     "[--cd] [--log <log_file>][--quiet] [--r] [--verbose] [--debug] [--cleanup] [--suh "
     "<true_or_false>] [--wraplog <log_file>] [--ub] <infile> [<outfile[.v]>]";
 
-TEST(VerilogUsage, ConstructorsStoreNameSynopsisAndExtension) {
+TEST(VerilogUsage, EachApplicationHasItsSynopsis) {
     Nlw_Verilog qdb2ver;
     EXPECT_STREQ(qdb2ver.GetApplicationName(), "qdb2ver");
     EXPECT_STREQ(qdb2ver.GetUsage(), kQdb2ver);
-    EXPECT_STREQ(qdb2ver.GetFileExtension(), "v");
-
-    static const char name[] = "tessel";
-    Nlw_Verilog tessel(name);
-    EXPECT_EQ(tessel.GetApplicationName(), name);
-    EXPECT_STREQ(tessel.GetUsage(), kTessel);
-    EXPECT_STREQ(tessel.GetFileExtension(), "v");
-
-    Nlw_Verilog assigned;
-    assigned = tessel;
-    EXPECT_STREQ(assigned.GetUsage(), kTessel);
+    EXPECT_STREQ(Nlw_Verilog("tessel").GetUsage(), kTessel);
 }
 
 TEST(VerilogUsage, ConstructorsSetTheBusStyles) {
@@ -51,17 +41,15 @@ TEST(VerilogUsage, ConstructorsSetTheBusStyles) {
     EXPECT_EQ(Nlw_NlBus::GetOutputDelimiterType(), 4);
 }
 
-struct HelpCase {
-    const char* appName;
-    bool isQdb2ver;
-};
-
 TEST(VerilogUsage, GetHelpChoosesThePrinterByApplicationName) {
-    const std::vector<HelpCase> cases = {
+    const struct {
+        const char* appName;
+        bool isQdb2ver;
+    } cases[] = {
         {"qdb2ver", true},   {"QDB2VER", true}, {"Qdb2Ver", true}, {"tessel", false},
         {"qdb2ver2", false}, {"qdb2", false},   {"", false},
     };
-    for (const HelpCase& c : cases) {
+    for (const auto& c : cases) {
         Nlw_Verilog nlw(c.appName);
         const Nlw_NetlistWriter::HelpFunction expected =
             c.isQdb2ver ? &Nlw_Verilog::Help : &Nlw_Verilog::TesselHelp;
@@ -111,15 +99,6 @@ TEST(VerilogUsage, HelpIssuesTheOptionListLineByLine) {
     ASSERT_EQ(capture.msgs.size(), 26u);
     EXPECT_EQ(capture.msgs[0].domain, "NetListWriters");
     EXPECT_EQ(capture.Texts(Port_MsgLevel::Status), expected);
-
-    // Explanations start in column 24, the -insert_chipwide line aside.
-    for (size_t i = 1; i <= 24; ++i) {
-        const std::string& line = capture.msgs[i].text;
-        if (line.find("-insert_chipwide") != std::string::npos) continue;
-        ASSERT_GT(line.size(), 24u) << line;
-        EXPECT_EQ(line[22], ' ') << line;
-        EXPECT_NE(line[23], ' ') << line;
-    }
 }
 
 const std::vector<std::string> kTesselLines = {

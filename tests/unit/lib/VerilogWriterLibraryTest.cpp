@@ -94,21 +94,6 @@ TEST_F(VerilogWriterLibrary, DeviceDataItemsBecomeMapEntries) {
                        "Adding (V_A:V_C) to the recursive inclusion map.\n"}));
 }
 
-TEST_F(VerilogWriterLibrary, CopiesKeepTheTables) {
-    root_.File("data/vdm2ver.acd", "BigEndingTimcell = V_FOO\nRecursiveInclusion = V_A:V_B\n");
-    root_.File("data/device.key", "HexStringProperty = INIT\nBitStringProperty = A, B\n");
-    auto writer = MakeWriter();
-    Nlw_VerilogWriter copy(*writer);
-    EXPECT_EQ(ToEntries(copy.GetBigEndingTimcellMap()), (Entries{{"V_FOO", "V_FOO"}}));
-    EXPECT_EQ(ToEntries(copy.GetRecursiveInclusionMap()), (Entries{{"V_A", "V_B"}}));
-    EXPECT_EQ(copy.GetHexStringPropertyCount(), 1u);
-    EXPECT_EQ(copy.GetBitStringPropertyCount(), 2u);
-    Nlw_VerilogWriter& self = copy;
-    copy = self;
-    EXPECT_EQ(copy.GetBitStringPropertyCount(), 2u);
-    EXPECT_EQ(copy.GetRecursiveInclusionMap().size(), 1u);
-}
-
 TEST_F(VerilogWriterLibrary, ModelsAreCopiedOnceAtTheirFirstNeed) {
     root_.File("data/vdm2ver.acd", "RecursiveInclusion = v_a:V_B:V_C, V_C\n");
     for (const char* m : {"V_A", "V_B", "V_C"})

@@ -45,12 +45,9 @@ TEST_F(VerilogWriterPorts, UntypedPortIsListedButNotDeclared) {
                                   "Nlw_VerilogWriter: Notype " + ub->ToString() + " detected.\n"}));
 }
 
-TEST_F(VerilogWriterPorts, ModuleWithoutPortsHasNoPortLine) {
-    EXPECT_EQ(Module(Root()), "module m (\n);\nendmodule\n\n");
-}
-
-TEST_F(VerilogWriterPorts, BusOnlyPortListBeginsWithIndentation) {
+TEST_F(VerilogWriterPorts, PortLineOnlyWithPortsAndIndentedForBusesAlone) {
     Nlw_NlBlock* m = Root();
+    EXPECT_EQ(Module(m), "module m (\n);\nendmodule\n\n");
     b_.AddPortBus(m, "d", NLW_DIR_OUTPUT, 1, 0);
     EXPECT_EQ(Module(m), "module m (\n  d\n);\n  output [1 : 0] d;\nendmodule\n\n");
 }
@@ -130,44 +127,23 @@ TEST_F(VerilogWriterPorts, AssignJoinsPortsToDifferentlyNamedNets) {
     EXPECT_NE(text.find("  wire n_u3;\n" + expected + "  DRV   u ("), std::string::npos) << text;
 }
 
-TEST_F(VerilogWriterPorts, NoAssignWhenEveryPortMatchesItsNet) {
+// A port on its own net takes no part; a global signal is written unescaped;
+// a bus bit keeps its index outside the escape.
+TEST_F(VerilogWriterPorts, AssignWritesGlobalsUnescapedAndBitIndexesOutside) {
     Nlw_NlBlock* m = Root();
-    Nlw_NlPin* a = b_.AddPort(m, "a", NLW_DIR_INPUT);
-    Nlw_NlPin* io = b_.AddPort(m, "io", NLW_DIR_INOUT);
-    b_.ConnectChild(a, b_.AddSignal(m, "a"));
-    b_.ConnectChild(io, b_.AddSignal(m, "io"));
-    EXPECT_EQ(Module(m), R"(module m (
-  a, io
-);
-  input a;
-  inout io;
-  wire a;
-  wire io;
-endmodule
-
-)");
-}
-
-TEST_F(VerilogWriterPorts, GlobalSignalIsWrittenUnescaped) {
-    Nlw_NlBlock* m = Root();
-    Nlw_NlPin* in = b_.AddPort(m, "gsr", NLW_DIR_INPUT);
-    Nlw_NlPin* out = b_.AddPort(m, "o", NLW_DIR_OUTPUT);
+    b_.ConnectChild(b_.AddPort(m, "a", NLW_DIR_INPUT), b_.AddSignal(m, "a"));
     Nlw_NlSignal* gsr = b_.AddSignal(m, "chipwide.GSR");
     gsr->AddProperty(Vdm_Property::NewBool("NLW_GLOBAL_SIGNAL", true));
-    b_.ConnectChild(in, gsr);
-    b_.ConnectChild(out, b_.AddSignal(m, "n.o"));
-    const std::string text = Module(m);
-    EXPECT_NE(text.find("  assign\n    chipwide.GSR = gsr,\n    o = \\n.o ;\n"), std::string::npos)
-        << text;
-}
-
-TEST_F(VerilogWriterPorts, BusBitsKeepTheirIndexOutsideTheEscape) {
-    Nlw_NlBlock* m = Root();
+    b_.ConnectChild(b_.AddPort(m, "gsr", NLW_DIR_INPUT), gsr);
+    b_.ConnectChild(b_.AddPort(m, "o", NLW_DIR_OUTPUT), b_.AddSignal(m, "n.o"));
     b_.AddPortBus(m, "d", NLW_DIR_INPUT, 1, 0);
     Nlw_NlBus* inner = b_.AddSignalBus(m, "n-x", 1, 0);
     b_.ConnectChild(m->GetPinByAlias("d[1]"), b_.GetSignalBusMember(inner, 1));
     const std::string text = Module(m);
-    EXPECT_NE(text.find("  assign\n    \\n-x [1] = d[1];\n"), std::string::npos) << text;
+    EXPECT_NE(text.find("  assign\n    chipwide.GSR = gsr,\n    o = \\n.o ,\n"
+                        "    \\n-x [1] = d[1];\n"),
+              std::string::npos)
+        << text;
 }
 
 }  // namespace

@@ -135,13 +135,19 @@ TEST_F(VerilogWriterPreamble, LibrarySearchTakesTheFirstRootHoldingTheDirectory)
         std::string roots;
         bool funcell;
         std::string line;  // empty: none found
+        std::vector<std::string> errors;
     };
     const Case cases[] = {
-        {plainFile + ":/no/such/dir:" + r1.Path() + ":" + r2.Path() + ":" + r3.Path(), false,
-         "`uselib dir=" + r2.Path() + "/verilog/src/timcells libext=.v\n"},
-        {r3.Path() + ":" + r2.Path(), true,
-         "`uselib dir=" + r2.Path() + "/verilog/src/funcells libext=.v\n"},
-        {r1.Path(), false, ""},
+        {plainFile + ":/no/such/dir:" + r1.Path() + ":" + r2.Path() + ":" + r3.Path(),
+         false,
+         "`uselib dir=" + r2.Path() + "/verilog/src/timcells libext=.v\n",
+         {}},
+        {r3.Path() + ":" + r2.Path(),
+         true,
+         "`uselib dir=" + r2.Path() + "/verilog/src/funcells libext=.v\n",
+         {}},
+        {r1.Path(), false, "", {kNoLibrary}},
+        {"", false, "", {kNoVornix, kNoLibrary}},
     };
     for (const Case& c : cases) {
         vornix_.Set(c.roots.c_str());
@@ -150,19 +156,8 @@ TEST_F(VerilogWriterPreamble, LibrarySearchTakesTheFirstRootHoldingTheDirectory)
         const std::string text = View();
         EXPECT_NE(text.find("`timescale 1 ns/1 ps\n" + c.line + "\nmodule top"), std::string::npos)
             << c.roots;
-        EXPECT_EQ(capture.Texts(Port_MsgLevel::Error), c.line.empty()
-                                                           ? std::vector<std::string>{kNoLibrary}
-                                                           : std::vector<std::string>{});
+        EXPECT_EQ(capture.Texts(Port_MsgLevel::Error), c.errors) << c.roots;
     }
-}
-
-TEST_F(VerilogWriterPreamble, LibrarySearchWithoutRootsGivesBothErrors) {
-    params_.SetWriteUseLib(true);
-    vornix_.Set("");
-    Port_MsgCapture capture;
-    EXPECT_NE(View().find("`timescale 1 ns/1 ps\n\nmodule top"), std::string::npos);
-    EXPECT_EQ(capture.Texts(Port_MsgLevel::Error),
-              (std::vector<std::string>{kNoVornix, kNoLibrary}));
 }
 
 TEST_F(VerilogWriterPreamble, SdfAnnotateNeedsPropertyOptionAndEnvironment) {
@@ -216,20 +211,17 @@ TEST_F(VerilogWriterPreamble, ShortModuleFileHead) {
               "`uselib dir=" +
                   root_.Path() + "/verilog/src/timcells libext=.v\n\n");
 
+    // The disclaimer follows the mode, equivalence checking first.
     params_.SetWriteUseLib(false);
-    params_.SetStaMode(true);
-    writer = MakeWriter();
-    writer->WriteMHHeader(top_);
-    EXPECT_NE(writer->GetMemoryText().find(
-                  "// should not be modified. This file cannot be synthesized and \n"
-                  "// should only be used with supported static timing analysis tools. \n\n"),
-              std::string::npos);
-    params_.SetEcnMode(true);
-    writer = MakeWriter();
-    writer->WriteMHHeader(top_);
-    EXPECT_NE(writer->GetMemoryText().find(
-                  "// should only be used with supported equivalence checking tools. \n\n"),
-              std::string::npos);
+    for (const char* tools : {"static timing analysis tools", "equivalence checking tools"}) {
+        params_.SetStaMode(true);
+        params_.SetEcnMode(tools[0] == 'e');
+        writer = MakeWriter();
+        writer->WriteMHHeader(top_);
+        EXPECT_NE(writer->GetMemoryText().find("// should only be used with supported " +
+                                               std::string(tools) + ". \n\n"),
+                  std::string::npos);
+    }
 }
 
 }  // namespace

@@ -2,12 +2,15 @@
 #include <gtest/gtest.h>
 
 #include <string>
+#include <type_traits>
 #include <vector>
 
 #include "Nlw_NlBuilder.h"
 #include "Nlw_Nl_LU.h"
 
 namespace {
+
+using Names = std::vector<std::string>;
 
 // Refuses names holding '-', legalizes them by replacing it with '_';
 // records what it was asked.
@@ -28,7 +31,7 @@ public:
         return Port::String(parts.first + parts.second);
     }
 
-    std::vector<std::string> asked;
+    Names asked;
 
 protected:
     bool UsesEscapedNames() const override { return escaped_; }
@@ -44,58 +47,58 @@ private:
     bool escaped_;
 };
 
-class Legalizer : public ::testing::Test {
+// Writable names of a list of objects or of object pointers.
+template <typename List>
+Names WritableNames(const List& list) {
+    Names out;
+    for (const auto& x : list) {
+        if constexpr (std::is_pointer_v<std::decay_t<decltype(x)>>)
+            out.push_back(x->GetWritableName());
+        else
+            out.push_back(x.GetWritableName());
+    }
+    return out;
+}
+Names Instances(const Nlw_NlBlock* b) {
+    return WritableNames(b->GetChildren());
+}
+Names Pins(const Nlw_NlBlock* b) {
+    return WritableNames(b->GetPins());
+}
+Names Signals(const Nlw_NlBlock* b) {
+    return WritableNames(b->GetSignals());
+}
+Names SignalBuses(const Nlw_NlBlock* b) {
+    return b->GetSignalBuses() ? WritableNames(*b->GetSignalBuses()) : Names{};
+}
+
+// A library cell CELL (pins A, Y) and the root instance top of module top.
+struct Design {
+    Design() {
+        b.AddTypePin(cell, "A", NLW_DIR_INPUT);
+        b.AddTypePin(cell, "Y", NLW_DIR_OUTPUT);
+    }
+    Nlw_NlView view;
+    Nlw_NlBuilder b{&view};
+    Nlw_NlType* cell = b.AddLibraryType("CELL", false, false);
+    Nlw_NlType* topType = b.AddModuleType("top");
+    Nlw_NlBlock* top = b.CreateRoot(topType, "top");
+};
+
+// Bracketed bus bits in and out, no keywords; undone when the test ends.
+class Legalizer : public ::testing::Test, protected Design {
 protected:
-    void SetUp() override {
+    Legalizer() {
         Nlw_NlBus::SetInputDelimiterType(4);
         Nlw_NlBus::SetOutputDelimiterType(4);
         Nlw_Nl_SpkCache::Clear();
-        cell = b.AddLibraryType("CELL", false, false);
-        b.AddTypePin(cell, "A", NLW_DIR_INPUT);
-        b.AddTypePin(cell, "Y", NLW_DIR_OUTPUT);
-        topType = b.AddModuleType("top");
-        top = b.CreateRoot(topType, "top");
     }
-    void TearDown() override {
+    ~Legalizer() override {
         Nlw_Nl_SpkCache::Clear();
         Nlw_NlBus::SetInputDelimiterType(7);
     }
-    void Run(bool escaped, bool bridge = true) {
-        DashLU lu(&view, escaped, bridge);
-        lu.Process();
-    }
-    std::vector<std::string> Instances(const Nlw_NlBlock* block) const {
-        std::vector<std::string> names;
-        for (const Nlw_NlBlock* child : block->GetChildren())
-            names.push_back(child->GetWritableName());
-        return names;
-    }
-    std::vector<std::string> Pins(const Nlw_NlBlock* block) const {
-        std::vector<std::string> names;
-        for (const Nlw_NlPin& pin : block->GetPins()) names.push_back(pin.GetWritableName());
-        return names;
-    }
-    std::vector<std::string> Signals(const Nlw_NlBlock* block) const {
-        std::vector<std::string> names;
-        for (const Nlw_NlSignal* s : block->GetSignals()) names.push_back(s->GetWritableName());
-        return names;
-    }
-    std::vector<std::string> SignalBuses(const Nlw_NlBlock* block) const {
-        std::vector<std::string> names;
-        if (block->GetSignalBuses())
-            for (const Nlw_NlBus* bus : *block->GetSignalBuses())
-                names.push_back(bus->GetWritableName());
-        return names;
-    }
-
-    Nlw_NlView view;
-    Nlw_NlBuilder b{&view};
-    Nlw_NlType* cell = nullptr;
-    Nlw_NlType* topType = nullptr;
-    Nlw_NlBlock* top = nullptr;
+    void Run(bool escaped, bool bridge = true) { DashLU(&view, escaped, bridge).Process(); }
 };
-
-using Names = std::vector<std::string>;
 
 TEST_F(Legalizer, LegalizesEveryKindOfNameAndKeepsTheOldOnesAsAka) {
     Nlw_NlType* sub = b.AddModuleType("my-sub");
@@ -114,7 +117,6 @@ TEST_F(Legalizer, LegalizesEveryKindOfNameAndKeepsTheOldOnesAsAka) {
 
     EXPECT_STREQ(sub->GetName(), "my_sub");
     EXPECT_STREQ(sub->GetAka(), "my-sub");
-    EXPECT_STREQ(s1->GetTypeName(), "my_sub");
     EXPECT_STREQ(odd->GetName(), "lib-cell");
     EXPECT_EQ(Instances(top), (Names{"u_1", "s_1"}));
     EXPECT_EQ(Pins(top), (Names{"in_a", "d_x[1]", "d_x[0]"}));
@@ -129,24 +131,13 @@ TEST_F(Legalizer, LegalizesEveryKindOfNameAndKeepsTheOldOnesAsAka) {
     EXPECT_STREQ(top->GetPin(2)->GetAka(), "d-x[0]");
     EXPECT_STREQ(net->GetAka(), "n-1");
     EXPECT_STREQ(bus->GetAka(), "b-s");
-    EXPECT_STREQ(net->GetModelName(), "n-1");
     EXPECT_EQ(top->GetPinByAlias("d_x[0]"), top->GetPin(2));
     EXPECT_EQ(top->FindPin("in_a"), port);
     EXPECT_EQ(top->GetAka(), nullptr);  // unchanged names get none
 }
 
-TEST_F(Legalizer, BridgesNothingWhenAskedNotTo) {
-    Nlw_NlBlock* u = b.CreateLeaf(top, cell, "u-1");
-    Nlw_NlSignal* n = b.AddSignal(top, "n-1");
-    Run(true, false);
-    EXPECT_STREQ(u->GetWritableName(), "u_1");
-    EXPECT_EQ(u->GetAka(), nullptr);
-    EXPECT_EQ(n->GetAka(), nullptr);
-}
-
 TEST_F(Legalizer, VisitsTypesThenEachMacrosNamesInWalkOrder) {
-    b.AddModuleType("sub");
-    Nlw_NlBlock* s = b.CreateMacro(top, view.FindType("sub"), "s");
+    Nlw_NlBlock* s = b.CreateMacro(top, b.AddModuleType("sub"), "s");
     b.CreateLeaf(top, cell, "u");
     b.AddPort(top, "p", NLW_DIR_INPUT);
     b.AddPortBus(top, "pb", NLW_DIR_INPUT, 0, 1);
@@ -165,62 +156,51 @@ TEST_F(Legalizer, VisitsTypesThenEachMacrosNamesInWalkOrder) {
                                "q"}));                             // the next macro
 }
 
-struct KeywordCase {
-    bool escaped;
-    Names instances;
-    Names signals;
-    Names signalBuses;
-    const char* type;
-};
-
 TEST_F(Legalizer, EscapesOrRenamesKeywords) {
-    const std::vector<KeywordCase> cases = {
+    struct Case {
+        bool cache, escaped;
+        Names names;  // instances, signals, signal buses, the module type
+    };
+    const Case cases[] = {
         {true,
-         {"\\signed ", "Wire", "\\module ", "\\bool "},
-         {"\\wire ", "\\logic [0]", "uwire_x"},
-         {"\\logic "},
-         "\\generate "},
+         true,
+         {"\\signed ", "Wire", "\\module ", "\\bool ", "\\wire ", "\\logic [0]", "uwire_x",
+          "\\logic ", "\\generate "}},
+        {true,
+         false,
+         {"signed_1", "Wire", "\\module ", "bool_1", "wire_1", "logic_1[0]", "uwire_x", "logic_1",
+          "generate_1"}},
+        // Without a keyword cache keywords are left alone.
         {false,
-         {"signed_1", "Wire", "\\module ", "bool_1"},
-         {"wire_1", "logic_1[0]", "uwire_x"},
-         {"logic_1"},
-         "generate_1"},
+         false,
+         {"signed", "Wire", "\\module ", "bool", "wire", "logic[0]", "uwire_x", "logic",
+          "generate"}},
     };
     static const char* table[] = {"wire", "module", nullptr};
-    for (const KeywordCase& c : cases) {
-        Nlw_NlView v;
-        Nlw_NlBuilder vb(&v);
-        Nlw_NlType* lib = vb.AddLibraryType("CELL", false, false);
-        Nlw_NlType* gen = vb.AddModuleType("generate");
-        Nlw_NlBlock* root = vb.CreateRoot(vb.AddModuleType("top"), "top");
+    for (const Case& c : cases) {
+        SCOPED_TRACE(::testing::Message() << "cache " << c.cache << " escaped " << c.escaped);
+        Nlw_Nl_SpkCache::Clear();
+        Design d;
+        Nlw_NlType* gen = d.b.AddModuleType("generate");
         for (const char* name : {"signed", "Wire", "\\module ", "bool"})
-            vb.CreateLeaf(root, lib, name);
-        vb.AddSignal(root, "wire");
-        vb.GetSignalBusMember(vb.AddSignalBus(root, "logic", 0, 0), 0);
-        vb.AddSignal(root, "uwire_x");
+            d.b.CreateLeaf(d.top, d.cell, name);
+        d.b.AddSignal(d.top, "wire");
+        d.b.GetSignalBusMember(d.b.AddSignalBus(d.top, "logic", 0, 0), 0);
+        d.b.AddSignal(d.top, "uwire_x");
 
-        Nlw_Nl_SpkCache::MakeSpkCache(table, true);
-        DashLU lu(&v, c.escaped);
-        lu.Process();
-        EXPECT_EQ(Instances(root), c.instances) << "escaped " << c.escaped;
-        EXPECT_EQ(Signals(root), c.signals) << "escaped " << c.escaped;
-        EXPECT_EQ(SignalBuses(root), c.signalBuses) << "escaped " << c.escaped;
-        EXPECT_STREQ(gen->GetName(), c.type) << "escaped " << c.escaped;
-        EXPECT_STREQ(root->GetChildren()[0]->GetAka(), "signed");
+        if (c.cache) Nlw_Nl_SpkCache::MakeSpkCache(table, true);
         // A second run finds nothing more to change.
-        DashLU again(&v, c.escaped);
-        again.Process();
-        EXPECT_EQ(Instances(root), c.instances) << "escaped " << c.escaped;
-        EXPECT_EQ(Signals(root), c.signals) << "escaped " << c.escaped;
+        for (int run = 0; run < 2; ++run) {
+            DashLU(&d.view, c.escaped).Process();
+            Names names = Instances(d.top);
+            for (const Names& more : {Signals(d.top), SignalBuses(d.top), Names{gen->GetName()}})
+                names.insert(names.end(), more.begin(), more.end());
+            EXPECT_EQ(names, c.names);
+        }
+        if (c.cache) {
+            EXPECT_STREQ(d.top->GetChildren()[0]->GetAka(), "signed");
+        }
     }
-}
-
-TEST_F(Legalizer, LeavesKeywordsAloneWithoutACache) {
-    b.CreateLeaf(top, cell, "signed");
-    b.AddSignal(top, "wire");
-    Run(false);
-    EXPECT_EQ(Instances(top), (Names{"signed"}));
-    EXPECT_EQ(Signals(top), (Names{"wire"}));
 }
 
 TEST_F(Legalizer, KeepsTheCachesWordsUntilRebuilt) {
@@ -235,23 +215,20 @@ TEST_F(Legalizer, KeepsTheCachesWordsUntilRebuilt) {
     EXPECT_TRUE(Nlw_Nl_SpkCache::IsKeyword("bar"));
     Nlw_Nl_SpkCache::MakeSpkCache(second, true);
     EXPECT_FALSE(Nlw_Nl_SpkCache::IsKeyword("foo"));
-    for (const char* word : {"uwire", "genvar", "localparam", "automatic", "config", "cell",
-                             "liblist", "incdir", "logic", "shortreal", "interface", "property",
-                             "assume", "cover", "bool", "unique0", "nettype", "endclocking"})
+    // Words of every language generation, exact case only.
+    for (const char* word :
+         {"uwire", "genvar", "config", "liblist", "logic", "interface", "unique0", "nettype"})
         EXPECT_TRUE(Nlw_Nl_SpkCache::IsKeyword(word)) << word;
-    for (const char* word : {"Wire", "WIRE", "wires", "", "\\wire "})
-        EXPECT_FALSE(Nlw_Nl_SpkCache::IsKeyword(word)) << word;
-    EXPECT_FALSE(Nlw_Nl_SpkCache::IsKeyword(nullptr));
+    for (const char* word : {"Wire", "wires", "", "\\wire ", static_cast<const char*>(nullptr)})
+        EXPECT_FALSE(Nlw_Nl_SpkCache::IsKeyword(word)) << (word ? word : "null");
 }
 
-struct ScopeCase {
-    const char* what;
-    Names instances;
-    Names expected;
-};
-
 TEST_F(Legalizer, MakesInstanceNamesUniqueGivingTheLaterOneASuffix) {
-    const std::vector<ScopeCase> cases = {
+    struct Case {
+        const char* what;
+        Names instances, expected;
+    };
+    const Case cases[] = {
         {"collide after legalizing", {"a_b", "a-b"}, {"a_b", "a_b_1"}},
         {"later object yields", {"a-b", "a_b"}, {"a_b", "a_b_1"}},
         {"smallest free suffix", {"x", "x", "x_1", "x"}, {"x", "x_1", "x_1_1", "x_2"}},
@@ -260,31 +237,12 @@ TEST_F(Legalizer, MakesInstanceNamesUniqueGivingTheLaterOneASuffix) {
         {"plain equals escaped", {"x", "\\x "}, {"x", "\\x_1 "}},
         {"suffix already taken", {"n_1", "n", "n"}, {"n_1", "n", "n_2"}},
     };
-    for (const ScopeCase& c : cases) {
-        Nlw_NlView v;
-        Nlw_NlBuilder vb(&v);
-        Nlw_NlType* lib = vb.AddLibraryType("CELL", false, false);
-        Nlw_NlBlock* root = vb.CreateRoot(vb.AddModuleType("top"), "top");
-        for (const std::string& name : c.instances) vb.CreateLeaf(root, lib, name.c_str());
-        DashLU lu(&v, true);
-        lu.Process();
-        EXPECT_EQ(Instances(root), c.expected) << c.what;
+    for (const Case& c : cases) {
+        Design d;
+        for (const std::string& name : c.instances) d.b.CreateLeaf(d.top, d.cell, name.c_str());
+        DashLU(&d.view, true).Process();
+        EXPECT_EQ(Instances(d.top), c.expected) << c.what;
     }
-}
-
-TEST_F(Legalizer, GivesBusesAndScalarsOfOneBaseNameApartNames) {
-    b.AddSignal(top, "d");
-    Nlw_NlBus* bus = b.AddSignalBus(top, "d", 1, 0);
-    b.GetSignalBusMember(bus, 1);
-    b.GetSignalBusMember(bus, 0);
-    b.AddPortBus(top, "p", NLW_DIR_INPUT, 1, 0);
-    b.AddPort(top, "p", NLW_DIR_INPUT);
-    Run(true);
-    EXPECT_EQ(Signals(top), (Names{"d", "d_1[1]", "d_1[0]"}));
-    EXPECT_EQ(SignalBuses(top), (Names{"d_1"}));
-    EXPECT_EQ(Pins(top), (Names{"p_1[1]", "p_1[0]", "p"}));
-    EXPECT_STREQ((*top->GetPinBuses())[0]->GetWritableName(), "p_1");
-    EXPECT_EQ(top->GetPinByAlias("p_1[0]"), top->GetPin(1));
 }
 
 TEST_F(Legalizer, LetsAPortShareItsNameOnlyWithItsOwnInsideSignal) {
@@ -308,18 +266,26 @@ TEST_F(Legalizer, LetsAPortShareItsNameOnlyWithItsOwnInsideSignal) {
     EXPECT_EQ(SignalBuses(top), (Names{"d", "e_1"}));
 }
 
-TEST_F(Legalizer, RenamesInstancesThatMeetNetOrPortNames) {
+// Buses and scalars of one base name get apart names; instances yield to
+// nets and ports.
+TEST_F(Legalizer, KeepsNamesOfDifferentKindsApart) {
+    b.AddSignal(top, "d");
+    Nlw_NlBus* bus = b.AddSignalBus(top, "d", 1, 0);
+    b.GetSignalBusMember(bus, 1);
+    b.GetSignalBusMember(bus, 0);
+    b.AddPortBus(top, "p", NLW_DIR_INPUT, 1, 0);
+    b.AddPort(top, "p", NLW_DIR_INPUT);
     b.AddPort(top, "q", NLW_DIR_OUTPUT);
     b.AddSignal(top, "u");
     b.AddSignalBus(top, "w", 1, 0);
-    b.CreateLeaf(top, cell, "u");
-    b.CreateLeaf(top, cell, "q");
-    b.CreateLeaf(top, cell, "w");
-    b.CreateLeaf(top, cell, "v");
+    for (const char* name : {"u", "q", "w", "v"}) b.CreateLeaf(top, cell, name);
     Run(true);
+    EXPECT_EQ(Signals(top), (Names{"d", "d_1[1]", "d_1[0]", "u"}));
+    EXPECT_EQ(SignalBuses(top), (Names{"d_1", "w"}));
+    EXPECT_EQ(Pins(top), (Names{"p_1[1]", "p_1[0]", "p", "q"}));
+    EXPECT_STREQ((*top->GetPinBuses())[0]->GetWritableName(), "p_1");
+    EXPECT_EQ(top->GetPinByAlias("p_1[0]"), top->GetPin(1));
     EXPECT_EQ(Instances(top), (Names{"u_1", "q_1", "w_1", "v"}));
-    EXPECT_EQ(Pins(top), (Names{"q"}));
-    EXPECT_EQ(Signals(top), (Names{"u"}));
 }
 
 TEST_F(Legalizer, MakesModuleTypeNamesUniqueAndLeavesLibraryTypesAlone) {
@@ -331,7 +297,6 @@ TEST_F(Legalizer, MakesModuleTypeNamesUniqueAndLeavesLibraryTypesAlone) {
     Run(true);
     EXPECT_STREQ(lib->GetName(), "lib-x");
     EXPECT_STREQ(cell->GetName(), "CELL");
-    EXPECT_STREQ(topType->GetName(), "top");
     EXPECT_STREQ(m1->GetName(), "my_t");
     EXPECT_STREQ(m2->GetName(), "my_t_1");
     EXPECT_STREQ(m3->GetName(), "CELL_1");
@@ -344,6 +309,7 @@ TEST_F(Legalizer, MakesModuleTypeNamesUniqueAndLeavesLibraryTypesAlone) {
 TEST_F(Legalizer, FollowsItsFlags) {
     Nlw_NlType* m = b.AddModuleType("m-x");
     Nlw_NlBlock* u = b.CreateLeaf(top, cell, "u-x");
+    Nlw_NlSignal* n = b.AddSignal(top, "n-1");
     {
         DashLU lu(&view, true, true, false, false);
         lu.Process();
@@ -351,13 +317,15 @@ TEST_F(Legalizer, FollowsItsFlags) {
     }
     EXPECT_STREQ(m->GetName(), "m-x");
     EXPECT_STREQ(u->GetWritableName(), "u-x");
-    DashLU types(&view, true, true, true, false);
-    types.Process();
+    DashLU(&view, true, true, true, false).Process();
     EXPECT_STREQ(m->GetName(), "m_x");
     EXPECT_STREQ(u->GetWritableName(), "u-x");
-    DashLU names(&view, true, true, false, true);
-    names.Process();
+    // Names only, and no bridge: no akas kept.
+    DashLU(&view, true, false, false, true).Process();
     EXPECT_STREQ(u->GetWritableName(), "u_x");
+    EXPECT_STREQ(n->GetWritableName(), "n_1");
+    EXPECT_EQ(u->GetAka(), nullptr);
+    EXPECT_EQ(n->GetAka(), nullptr);
 }
 
 TEST_F(Legalizer, RenamesLibraryCellPinsForAllInstancesOnlyWhenAsked) {
@@ -371,8 +339,7 @@ TEST_F(Legalizer, RenamesLibraryCellPinsForAllInstancesOnlyWhenAsked) {
     Run(true);
     EXPECT_EQ(Pins(u1), (Names{"a-b", "d-x[1]", "d-x[0]", "ok", "a_b"}));
 
-    DashLU lu(&view, true, true, false, false, true);
-    lu.Process();
+    DashLU(&view, true, true, false, false, true).Process();
     for (const Nlw_NlBlock* u : {u1, u2}) {
         EXPECT_EQ(Pins(u), (Names{"a_b", "d_x[1]", "d_x[0]", "ok", "a_b_1"}));
         EXPECT_EQ(u->GetPinByAlias("d_x[0]"), u->GetPin(2));
@@ -386,29 +353,20 @@ TEST_F(Legalizer, RenamesLibraryCellPinsForAllInstancesOnlyWhenAsked) {
 
 TEST_F(Legalizer, ShortensLongNamesToDistinctNamesWithinTheLimit) {
     const std::string stem(2500, 'a');
-    const std::string one = stem + "-one";
-    const std::string two = stem + "-two";
+    const std::string one = stem + "-one", two = stem + "-two";
     const std::string escaped = "\\" + std::string(3000, 'e') + " ";
     const std::string exact(2047, 'x');
     const std::string busBase(2045, 'b');
-    auto build = [&](Nlw_NlView& v) {
-        Nlw_NlBuilder vb(&v);
-        Nlw_NlType* lib = vb.AddLibraryType("CELL", false, false);
-        Nlw_NlBlock* root = vb.CreateRoot(vb.AddModuleType("top"), "top");
+    Design d1, d2;
+    for (Design* d : {&d1, &d2}) {
         for (const std::string* name : {&one, &two, &escaped, &exact, &exact})
-            vb.CreateLeaf(root, lib, name->c_str());
-        Nlw_NlBus* bus = vb.AddSignalBus(root, busBase.c_str(), 100, 0);
-        vb.GetSignalBusMember(bus, 100);
-        return root;
-    };
-    Nlw_NlView v1, v2;
-    Nlw_NlBlock* r1 = build(v1);
-    Nlw_NlBlock* r2 = build(v2);
-    DashLU(&v1, true).Process();
-    DashLU(&v2, true).Process();
+            d->b.CreateLeaf(d->top, d->cell, name->c_str());
+        d->b.GetSignalBusMember(d->b.AddSignalBus(d->top, busBase.c_str(), 100, 0), 100);
+        DashLU(&d->view, true).Process();
+    }
 
-    const Names names = Instances(r1);
-    EXPECT_EQ(names, Instances(r2));  // deterministic
+    const Names names = Instances(d1.top);
+    EXPECT_EQ(names, Instances(d2.top));  // deterministic
     for (const std::string& name : names) EXPECT_LE(name.size(), 2047u);
     EXPECT_NE(names[0], names[1]);
     EXPECT_EQ(names[0].substr(0, 2000), stem.substr(0, 2000));
@@ -416,12 +374,10 @@ TEST_F(Legalizer, ShortensLongNamesToDistinctNamesWithinTheLimit) {
     EXPECT_EQ(names[2].back(), ' ');
     EXPECT_EQ(names[3], exact);
     EXPECT_EQ(names[4], exact.substr(0, 2045) + "_1");
-    const std::string bus = (*r1->GetSignalBuses())[0]->GetWritableName();
-    const std::string member = r1->GetSignals()[0]->GetWritableName();
-    EXPECT_LT(bus.size(), busBase.size());
-    EXPECT_EQ(member, bus + "[100]");
-    EXPECT_LE(member.size(), 2047u);
-    EXPECT_STREQ(r1->GetChildren()[0]->GetAka(), one.c_str());
+    const std::string bus = SignalBuses(d1.top)[0];
+    EXPECT_LE(bus.size() + 5, 2047u);
+    EXPECT_EQ(Signals(d1.top), Names{bus + "[100]"});
+    EXPECT_STREQ(d1.top->GetChildren()[0]->GetAka(), one.c_str());
 }
 
 }  // namespace

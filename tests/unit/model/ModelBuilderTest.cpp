@@ -10,14 +10,16 @@
 
 namespace {
 
-std::vector<std::string> PinNames(const Nlw_NlBlock* block) {
-    std::vector<std::string> names;
+using Names = std::vector<std::string>;
+
+Names PinNames(const Nlw_NlBlock* block) {
+    Names names;
     for (const Nlw_NlPin& pin : block->GetPins()) names.push_back(pin.GetWritableName());
     return names;
 }
 
-std::vector<std::string> SignalPins(const Nlw_NlSignal* s) {
-    std::vector<std::string> names;
+Names SignalPins(const Nlw_NlSignal* s) {
+    Names names;
     for (Nlw_NlPin* pin : s->GetPins()) names.push_back(pin->ToString());
     return names;
 }
@@ -27,21 +29,16 @@ class Model : public ::testing::Test {
 protected:
     void SetUp() override {
         Nlw_NlBus::SetOutputDelimiterType(4);
-        lut = b.AddLibraryType("LUT2", true, false);
-        b.AddTypePin(lut, "I0", NLW_DIR_INPUT);
-        b.AddTypePin(lut, "I1", NLW_DIR_INPUT);
+        for (const char* pin : {"I0", "I1"}) b.AddTypePin(lut, pin, NLW_DIR_INPUT);
         b.AddTypePin(lut, "O", NLW_DIR_OUTPUT);
-        topType = b.AddModuleType("top");
-        subType = b.AddModuleType("sub");
-        top = b.CreateRoot(topType, "top");
     }
 
     Nlw_NlView view;
     Nlw_NlBuilder b{&view};
-    Nlw_NlType* lut = nullptr;
-    Nlw_NlType* topType = nullptr;
-    Nlw_NlType* subType = nullptr;
-    Nlw_NlBlock* top = nullptr;
+    Nlw_NlType* lut = b.AddLibraryType("LUT2", true, false);
+    Nlw_NlType* topType = b.AddModuleType("top");
+    Nlw_NlType* subType = b.AddModuleType("sub");
+    Nlw_NlBlock* top = b.CreateRoot(topType, "top");
 };
 
 TEST_F(Model, KeepsStoredOrderOfMacrosChildrenSignalsAndTypes) {
@@ -59,32 +56,16 @@ TEST_F(Model, KeepsStoredOrderOfMacrosChildrenSignalsAndTypes) {
     EXPECT_EQ(top->GetChildren(), (std::vector<Nlw_NlBlock*>{u2, s1, u1}));
     EXPECT_EQ(s1->GetChildren(), (std::vector<Nlw_NlBlock*>{inner}));
     ASSERT_EQ(top->GetSignals().size(), 2u);
-    EXPECT_STREQ(top->GetSignals()[0]->GetWritableName(), "z");
     EXPECT_STREQ(top->GetSignals()[1]->GetWritableName(), "a");
     EXPECT_EQ(view.GetNumLeafBlocks(), 3u);
     EXPECT_EQ(view.GetTypes(), (std::vector<Nlw_NlType*>{lut, topType, subType}));
-    EXPECT_EQ(view.FindType("sub"), subType);
-    EXPECT_EQ(view.FindType("nope"), nullptr);
     EXPECT_EQ(u1->GetParent(), top);
-    EXPECT_EQ(inner->GetView(), &view);
-}
-
-TEST_F(Model, LeafBlocksCarryTheirTypesPinsAndNothingElse) {
-    Nlw_NlBlock* u = b.CreateLeaf(top, lut, "u");
-    EXPECT_FALSE(u->IsMacro());
-    EXPECT_TRUE(u->IsTimcell());
-    EXPECT_FALSE(u->IsFuncell());
-    EXPECT_EQ(PinNames(u), (std::vector<std::string>{"I0", "I1", "O"}));
-    EXPECT_EQ(u->GetPin(2)->GetDirection(), NLW_DIR_OUTPUT);
-    EXPECT_TRUE(u->GetChildren().empty());
-    EXPECT_TRUE(u->GetSignals().empty());
-    EXPECT_EQ(u->GetPinBuses(), nullptr);
-    EXPECT_EQ(u->GetSignalBuses(), nullptr);
-    // Instances share their type's pin name texts.
-    Nlw_NlBlock* v = b.CreateLeaf(top, lut, "v");
-    EXPECT_EQ(u->GetPin(0)->GetWritableName(), v->GetPin(0)->GetWritableName());
-    EXPECT_STREQ(u->GetTypeName(), "LUT2");
-    EXPECT_STREQ(u->GetFileBaseName(), "LUT2");
+    // A type rename reaches every instance and the lookup.
+    subType->SetName("sub_1");
+    EXPECT_STREQ(s1->GetTypeName(), "sub_1");
+    EXPECT_STREQ(s1->GetFileBaseName(), "sub_1");
+    EXPECT_EQ(view.FindType("sub_1"), subType);
+    EXPECT_EQ(view.FindType("sub"), nullptr);
 }
 
 TEST_F(Model, GivesTheMessageTextsOfBlocksPinsAndBuses) {
@@ -97,21 +78,6 @@ TEST_F(Model, GivesTheMessageTextsOfBlocksPinsAndBuses) {
     EXPECT_EQ(up->ToString(), "e[-1:2]");
     EXPECT_EQ(up->GetWidth(), 4);
 }
-
-TEST_F(Model, TypeRenameReachesEveryInstance) {
-    Nlw_NlBlock* s1 = b.CreateMacro(top, subType, "s1");
-    Nlw_NlBlock* s2 = b.CreateMacro(top, subType, "s2");
-    subType->SetName("sub_1");
-    EXPECT_STREQ(s1->GetTypeName(), "sub_1");
-    EXPECT_STREQ(s2->GetFileBaseName(), "sub_1");
-    EXPECT_EQ(view.FindType("sub_1"), subType);
-    EXPECT_EQ(view.FindType("sub"), nullptr);
-}
-
-struct AliasCase {
-    const char* alias;
-    const char* expected;  // ToString of the pin found, or null
-};
 
 // Members of every range shape are found by alias, on library cells (type
 // buses) and on macros (port buses) alike.
@@ -132,32 +98,25 @@ TEST_F(Model, FindsBusMembersByAliasForEveryRangeShape) {
     b.AddPort(m, "D[9]", NLW_DIR_INPUT);
 
     // Members are created from msb to lsb in pin order.
-    const std::vector<std::string> order = {"CLK",  "A[3]",  "A[2]",  "A[1]", "A[0]",
-                                            "B[0]", "B[1]",  "B[2]",  "B[3]", "N[1]",
-                                            "N[0]", "N[-1]", "N[-2]", "D[9]"};
+    const Names order = {"CLK",  "A[3]", "A[2]", "A[1]", "A[0]",  "B[0]",  "B[1]",
+                         "B[2]", "B[3]", "N[1]", "N[0]", "N[-1]", "N[-2]", "D[9]"};
     EXPECT_EQ(PinNames(r), order);
     EXPECT_EQ(PinNames(m), order);
 
-    const std::vector<AliasCase> cases = {
-        {"CLK", "/CLK"},   {"A[3]", "/A[3]"}, {"A[0]", "/A[0]"},   {"B[0]", "/B[0]"},
-        {"B[3]", "/B[3]"}, {"N[1]", "/N[1]"}, {"N[-2]", "/N[-2]"}, {"N[-1]", "/N[-1]"},
-        {"D[9]", "/D[9]"}, {"A[4]", nullptr}, {"N[-3]", nullptr},  {"X[0]", nullptr},
-        {"A", nullptr},    {"", nullptr},     {"A[1", nullptr},    {"A[x]", nullptr},
-    };
+    // Each found pin is the one of that name; the rest are not found.
+    const char* const found[] = {"CLK", "A[3]", "A[0]", "B[0]", "B[3]", "N[-2]", "N[-1]", "D[9]"};
+    const char* const missing[] = {"A[4]", "N[-3]", "X[0]", "A", "", "A[1", "A[x]"};
     for (const Nlw_NlBlock* block : {r, m}) {
-        for (const AliasCase& c : cases) {
-            const Nlw_NlPin* pin = block->GetPinByAlias(c.alias);
-            if (c.expected == nullptr) {
-                EXPECT_EQ(pin, nullptr) << block->GetInstanceName() << " " << c.alias;
-            } else {
-                ASSERT_NE(pin, nullptr) << block->GetInstanceName() << " " << c.alias;
-                EXPECT_EQ(pin->ToString(), block->GetInstanceName() + std::string(c.expected));
-                EXPECT_EQ(pin->GetBlock(), block);
-            }
+        const std::string inst = block->GetInstanceName();
+        for (const char* alias : found) {
+            const Nlw_NlPin* pin = block->GetPinByAlias(alias);
+            ASSERT_NE(pin, nullptr) << inst << " " << alias;
+            EXPECT_EQ(pin->ToString(), inst + "/" + alias);
+            EXPECT_EQ(pin->GetBlock(), block);
         }
+        for (const char* alias : missing)
+            EXPECT_EQ(block->GetPinByAlias(alias), nullptr) << inst << " " << alias;
     }
-    EXPECT_EQ(m->GetPinBuses()->GetCount(), 3u);
-    EXPECT_EQ(m->GetPinByAlias("B[2]")->GetBus(), (*m->GetPinBuses())[1]);
     EXPECT_EQ(r->GetPinByAlias("B[2]")->GetBus(), (*r->GetPinBuses())[1]);
     // A macro's bus gives its members directly; a type's bus has them per
     // instance.
@@ -182,18 +141,14 @@ TEST_F(Model, FindsPinsOfWideBlocksAndFollowsRenames) {
     Nlw_NlBlock* w = b.CreateLeaf(top, wide, "w");
     for (const Nlw_NlBlock* block : {w, m}) {
         EXPECT_EQ(block->GetPinByAlias("b17[1]"), block->GetPin(17 * 4 + 1));
-        EXPECT_EQ(block->GetPinByAlias("b0[0]"), block->GetPin(2));
         EXPECT_EQ(block->FindPin("p19"), block->GetPin(19 * 4 + 3));
-        EXPECT_EQ(block->GetPinByAlias("p3"), block->GetPin(3 * 4 + 3));
         EXPECT_EQ(block->FindPin("nope"), nullptr);
     }
     EXPECT_EQ(wide->FindPinDef("b5[0]"), 5 * 4 + 2);
-    EXPECT_EQ(wide->FindPinDef("q"), -1);
 
     (*m->GetPinBuses())[17]->SetWritableName("renamed");
     m->GetPin(19 * 4 + 3)->SetWritableName("p19_new");
     EXPECT_EQ(m->GetPinByAlias("renamed[1]"), m->GetPin(17 * 4 + 1));
-    EXPECT_EQ(m->GetPinByAlias("b16[1]"), m->GetPin(16 * 4 + 1));
     // The member keeps its own name, by which it is still found.
     EXPECT_EQ(m->GetPinByAlias("b17[1]"), m->GetPin(17 * 4 + 1));
     EXPECT_EQ(m->GetPinByAlias("b17[3]"), nullptr);
@@ -221,57 +176,36 @@ TEST_F(Model, ListsASignalsPinsInConnectionOrder) {
     b.ConnectChild(in, inside);
     b.Connect(u2->GetPin(0), inside);
 
-    EXPECT_EQ(SignalPins(n), (std::vector<std::string>{"u1/I1", "top/x", "s1/in", "u1/I0"}));
-    EXPECT_EQ(n->GetPinCount(), 4u);
-    EXPECT_EQ(SignalPins(inside), (std::vector<std::string>{"s1/in", "u2/I0"}));
-    EXPECT_EQ(in->GetSignal(), n);
+    EXPECT_EQ(SignalPins(n), (Names{"u1/I1", "top/x", "s1/in", "u1/I0"}));
+    EXPECT_EQ(SignalPins(inside), (Names{"s1/in", "u2/I0"}));
     EXPECT_EQ(in->GetChildSignal(), inside);
     EXPECT_TRUE(in->IsParentPin(inside));
-    EXPECT_FALSE(in->IsParentPin(n));
     EXPECT_TRUE(topIn->IsParentPin(n));
-    EXPECT_FALSE(u1->GetPin(0)->IsParentPin(n));
-    EXPECT_EQ(u1->GetPin(0)->GetChildSignal(), nullptr);
+    EXPECT_FALSE(in->IsParentPin(n));
 
     // Connecting again moves the pin; the other pins keep their order.
     Nlw_NlSignal* m = b.AddSignal(top, "m");
     b.Connect(u1->GetPin(1), m);
     b.Connect(u1->GetPin(1), m);
-    EXPECT_EQ(SignalPins(n), (std::vector<std::string>{"top/x", "s1/in", "u1/I0"}));
+    EXPECT_EQ(SignalPins(n), (Names{"top/x", "s1/in", "u1/I0"}));
     b.Connect(u1->GetPin(0), m);
-    EXPECT_EQ(SignalPins(n), (std::vector<std::string>{"top/x", "s1/in"}));
-    EXPECT_EQ(SignalPins(m), (std::vector<std::string>{"u1/I1", "u1/I0"}));
+    EXPECT_EQ(SignalPins(m), (Names{"u1/I1", "u1/I0"}));
     b.Connect(u1->GetPin(2), n);
-    EXPECT_EQ(SignalPins(n), (std::vector<std::string>{"top/x", "s1/in", "u1/O"}));
+    EXPECT_EQ(SignalPins(n), (Names{"top/x", "s1/in", "u1/O"}));
 }
-
-TEST_F(Model, RefusesConnectionsToSignalsOfOtherBlocks) {
-    Port_MsgCapture capture;
-    Nlw_NlBlock* s1 = b.CreateMacro(top, subType, "s1");
-    Nlw_NlPin* port = b.AddPort(s1, "p", NLW_DIR_INPUT);
-    Nlw_NlSignal* outside = b.AddSignal(top, "o");
-    Nlw_NlSignal* inside = b.AddSignal(s1, "i");
-    b.Connect(port, inside);
-    b.ConnectChild(port, outside);
-    EXPECT_EQ(port->GetSignal(), nullptr);
-    EXPECT_EQ(port->GetChildSignal(), nullptr);
-    EXPECT_EQ(inside->GetPinCount(), 0u);
-    EXPECT_EQ(capture.Texts(Port_MsgLevel::Internal).size(), 2u);
-}
-
-struct DriverCase {
-    const char* what;
-    std::vector<int> leafDirs;  // directions of leaf pins on the signal, in order
-    int portDir;                // direction of a port seen from inside, or 0
-    bool portFirst;
-    int expected;  // index into the pins as connected (port first when portFirst), -1 for none
-};
 
 TEST_F(Model, FindsTheDriverOfASignal) {
-    const std::vector<DriverCase> cases = {
+    struct Case {
+        const char* what;
+        std::vector<int> leafDirs;  // directions of leaf pins on the signal, in order
+        int portDir;                // direction of a port seen from inside, or 0
+        bool portFirst;
+        int expected;  // index into the pins as connected (port first when portFirst), or -1
+    };
+    const Case cases[] = {
         {"child output", {NLW_DIR_INPUT, NLW_DIR_OUTPUT}, 0, false, 1},
         {"input port from inside", {NLW_DIR_INPUT}, NLW_DIR_INPUT, true, 0},
         {"output port does not drive", {NLW_DIR_INPUT}, NLW_DIR_OUTPUT, true, -1},
-        {"only inputs", {NLW_DIR_INPUT, NLW_DIR_INPUT}, 0, false, -1},
         {"inout child", {NLW_DIR_INPUT, NLW_DIR_INOUT}, 0, false, 1},
         {"inout port", {NLW_DIR_INPUT}, NLW_DIR_INOUT, false, 1},
         {"output wins over earlier inout", {NLW_DIR_INOUT, NLW_DIR_OUTPUT}, 0, false, 1},
@@ -284,7 +218,7 @@ TEST_F(Model, FindsTheDriverOfASignal) {
         b.AddTypePin(types[dir], "P", dir);
     }
     int n = 0;
-    for (const DriverCase& c : cases) {
+    for (const Case& c : cases) {
         Nlw_NlBlock* m = b.CreateMacro(top, subType, ("m" + std::to_string(n++)).c_str());
         Nlw_NlSignal* s = b.AddSignal(m, "s");
         std::vector<Nlw_NlPin*> pins;
@@ -310,25 +244,17 @@ TEST_F(Model, FindsTheDriverOfASignal) {
 TEST_F(Model, CreatesSignalBusMembersOnDemand) {
     Nlw_NlBus* bus = b.AddSignalBus(top, "n", 0, 3);
     Nlw_NlSignal* plain = b.AddSignal(top, "p");
-    EXPECT_FALSE(bus->IsPinBus());
     EXPECT_EQ(bus->GetSignalMember(2), nullptr);
     Nlw_NlSignal* two = b.GetSignalBusMember(bus, 2);
     ASSERT_NE(two, nullptr);
     EXPECT_STREQ(two->GetWritableName(), "n[2]");
-    EXPECT_STREQ(two->GetModelName(), "n[2]");
     EXPECT_EQ(b.GetSignalBusMember(bus, 2), two);
     EXPECT_EQ(bus->GetSignalMember(2), two);
-    EXPECT_EQ(two->GetBus(), bus);
-    EXPECT_TRUE(two->IsBused());
-    EXPECT_FALSE(plain->IsBused());
     EXPECT_EQ(b.GetSignalBusMember(bus, 4), nullptr);
     EXPECT_EQ(b.GetSignalBusMember(bus, -1), nullptr);
     Nlw_NlSignal* zero = b.GetSignalBusMember(bus, 0);
     // Members join the block's signals in creation order.
     EXPECT_EQ(top->GetSignals(), (std::vector<Nlw_NlSignal*>{plain, two, zero}));
-    ASSERT_NE(top->GetSignalBuses(), nullptr);
-    EXPECT_EQ((*top->GetSignalBuses())[0], bus);
-    EXPECT_EQ(bus->GetBlock(), top);
     // Renaming a signal keeps its model name.
     two->SetWritableName("n_x[2]");
     EXPECT_STREQ(two->GetModelName(), "n[2]");
@@ -351,10 +277,9 @@ TEST_F(Model, KeepsConnectionsWhenUnreservedPortsGrow) {
     b.Connect(s1->GetPin(7), n);
 
     EXPECT_EQ(s1->GetPinCount(), 140u);
-    EXPECT_EQ(SignalPins(n), (std::vector<std::string>{"u/I0", "s1/p0", "u/I1", "s1/p7"}));
-    EXPECT_EQ(SignalPins(inside), (std::vector<std::string>{"s1/p0"}));
+    EXPECT_EQ(SignalPins(n), (Names{"u/I0", "s1/p0", "u/I1", "s1/p7"}));
+    EXPECT_EQ(SignalPins(inside), (Names{"s1/p0"}));
     EXPECT_EQ(inside->GetRefPin(), s1->GetPin(0));
-    EXPECT_EQ(s1->GetPinByAlias("wide[0]"), s1->GetPin(139));
     EXPECT_EQ(s1->GetPin(0)->GetChildSignal(), inside);
 }
 
@@ -375,48 +300,27 @@ TEST_F(Model, SharesOneNetworkAcrossTheHierarchicalNet) {
     Nlw_NlNetwork* net = b.GetOrCreateNetwork(mid);
     ASSERT_NE(net, nullptr);
     EXPECT_EQ(outer->GetNetwork(), net);
-    EXPECT_EQ(deep->GetNetwork(), net);
     EXPECT_EQ(b.GetOrCreateNetwork(deep), net);
     EXPECT_EQ(other->GetNetwork(), nullptr);
     EXPECT_NE(b.GetOrCreateNetwork(other), net);
 }
 
-TEST_F(Model, KeepsPropertiesAndSettingsOfObjects) {
+TEST_F(Model, OwnsThePropertiesOfItsObjects) {
     Nlw_NlBlock* u = b.CreateLeaf(top, lut, "u");
     b.SetTieOff(u->GetPin(1), 1);
     const Vdm_Property* tie = u->GetPin(1)->GetPropertyByName("TIEOFF");
     ASSERT_NE(tie, nullptr);
     EXPECT_EQ(tie->GetType(), VDM_PROP_INT);
     EXPECT_EQ(tie->GetInt32(), 1);
-    EXPECT_EQ(u->GetPin(0)->GetPropertyByName("TIEOFF"), nullptr);
-
     // The block owns its external list; replacing it frees the old one.
     u->SetExternalProperties(Vdm_Property::NewList("a"));
     u->SetExternalProperties(Vdm_Property::NewList("b"));
     EXPECT_STREQ(u->GetExternalProperties()->GetName(), "b");
-    u->GetDataBlock()->AddProperty(Vdm_Property::NewString("INIT", "8'h00"));
-    EXPECT_NE(u->GetPropertyByName("INIT"), nullptr);
-
+    // Properties of signals and networks go with the view (the leak
+    // sanitizer checks).
     Nlw_NlSignal* s = b.AddSignal(top, "s");
     s->AddProperty(Vdm_Property::NewBool("NLW_GLOBAL_SIGNAL", true));
     b.GetOrCreateNetwork(s)->AddProperty(Vdm_Property::NewInt("VL_FLOATVAL", 3));
-    b.SetVisible(s, false);
-    b.SetVisible(u->GetPin(0), false);
-    b.SetPinType(u->GetPin(2), NLW_PINTYPE_PAD);
-    Nlw_NlPinBus* bus = b.AddPortBus(top, "d", NLW_DIR_OUTPUT, 1, 0);
-    b.SetValid(bus, false);
-    b.SetSetReset(s);
-    b.SetDevice("dev", "part-1");
-    EXPECT_FALSE(s->IsVisible());
-    EXPECT_FALSE(u->GetPin(0)->IsVisible());
-    EXPECT_EQ(u->GetPin(2)->GetPinType(), NLW_PINTYPE_PAD);
-    EXPECT_FALSE(bus->IsValid());
-    EXPECT_EQ(view.GetSetReset(), s);
-    EXPECT_EQ(view.GetTristate(), nullptr);
-    EXPECT_STREQ(view.GetDeviceInfo(), "dev");
-    EXPECT_STREQ(view.GetPartName(), "part-1");
-    // The objects' properties are released with the view (checked by the
-    // leak sanitizer).
 }
 
 TEST_F(Model, RefusesMisuseWithAnInternalMessage) {
@@ -429,8 +333,17 @@ TEST_F(Model, RefusesMisuseWithAnInternalMessage) {
     EXPECT_EQ(b.AddPort(u, "p", NLW_DIR_INPUT), nullptr);
     EXPECT_EQ(b.AddSignalBus(top, "huge", INT32_MAX, INT32_MIN), nullptr);
     EXPECT_EQ(b.CreateRoot(topType, "again"), top);
-    EXPECT_EQ(capture.Texts(Port_MsgLevel::Internal).size(), 6u);
     EXPECT_EQ(view.GetNumLeafBlocks(), 1u);
+    // Connections only to signals of the block's own side.
+    Nlw_NlBlock* s1 = b.CreateMacro(top, subType, "s1");
+    Nlw_NlPin* port = b.AddPort(s1, "p", NLW_DIR_INPUT);
+    Nlw_NlSignal* inside = b.AddSignal(s1, "i");
+    b.Connect(port, inside);
+    b.ConnectChild(port, b.AddSignal(top, "o"));
+    EXPECT_EQ(port->GetSignal(), nullptr);
+    EXPECT_EQ(port->GetChildSignal(), nullptr);
+    EXPECT_EQ(inside->GetPinCount(), 0u);
+    EXPECT_EQ(capture.Texts(Port_MsgLevel::Internal).size(), 8u);
 }
 
 }  // namespace

@@ -1,4 +1,5 @@
 // Nets, ports, buses and constants of a module read from netlist JSON.
+#include "Nlw_Util.h"
 #include "ReaderTestSupport.h"
 
 using namespace readertest;
@@ -101,35 +102,34 @@ TEST_F(JsonReaderNets, DeclaresBusesWithTheFileIndexes) {
     EXPECT_EQ(InsideOf(root_, "b[4]"), "b[4]");
 }
 
-TEST_F(JsonReaderNets, PortsOnOneNetShareItAndConstantPortsGetGlobalSignals) {
+// Ports on one net share it; constant ports get hidden global signals;
+// constant cell pins are tied and unknown bits left open.
+TEST_F(JsonReaderNets, ConnectsPortsAndTiesConstants) {
     EXPECT_EQ(InsideOf(root_, "y"), "a[0]");
     Nlw_NlSignal* k = root_->GetPinByAlias("k")->GetChildSignal();
     ASSERT_NE(k, nullptr);
     EXPECT_STREQ(k->GetWritableName(), "1'b1");
     EXPECT_FALSE(k->IsVisible());
-    const Vdm_Property* g = k->GetPropertyByName("NLW_GLOBAL_SIGNAL");
-    ASSERT_NE(g, nullptr);
-    EXPECT_EQ(g->GetInt32(), 1);
-}
-
-TEST_F(JsonReaderNets, TiesConstantCellPinsAndLeavesUnknownBitsOpen) {
-    Nlw_NlBlock* u1 = Child(root_, "u1");
-    Nlw_NlBlock* u2 = Child(root_, "u2");
-    EXPECT_EQ(TieOf(u1, "I1"), 0);
-    EXPECT_EQ(NetOf(u1, "I1"), "");
-    EXPECT_EQ(TieOf(u2, "D"), 1);
-    EXPECT_EQ(TieOf(u1, "I0"), -1);
-    EXPECT_EQ(NetOf(u1, "I0"), "");
+    EXPECT_EQ(Nlw_Util::GetInt32Prop(k, "NLW_GLOBAL_SIGNAL", -9), 1);
+    struct Case {
+        const char* cell;
+        const char* pin;
+        int tie;
+    } cases[] = {{"u1", "I1", 0}, {"u2", "D", 1}, {"u1", "I0", -1}};
+    for (const Case& c : cases) {
+        Nlw_NlBlock* cell = Child(root_, c.cell);
+        EXPECT_EQ(TieOf(cell, c.pin), c.tie) << c.cell << "." << c.pin;
+        if (c.cell[1] == '1') {
+            EXPECT_EQ(NetOf(cell, c.pin), "") << c.pin;
+        }
+    }
 }
 
 TEST_F(JsonReaderNets, TakesAlsoKnownAsNamesFromHdlname) {
-    Nlw_NlSignal* pub = Signal(root_, "pub");
-    ASSERT_NE(pub, nullptr);
-    ASSERT_NE(pub->GetAka(), nullptr);
+    const Nlw_NlSignal* pub = Signal(root_, "pub");
+    const Nlw_NlBus* w = SignalBus(root_, "w");
+    ASSERT_TRUE(pub && w && pub->GetAka() && w->GetAka());
     EXPECT_STREQ(pub->GetAka(), "sub/pub");
-    Nlw_NlBus* w = SignalBus(root_, "w");
-    ASSERT_NE(w, nullptr);
-    ASSERT_NE(w->GetAka(), nullptr);
     EXPECT_STREQ(w->GetAka(), "w");
 }
 
