@@ -12,6 +12,7 @@
 #include "Nlw_Util.h"
 #include "Nlw_Verilog.h"
 #include "Port.h"
+#include "UT.h"
 
 namespace {
 
@@ -83,6 +84,18 @@ int Nlw_RunProgram(Nlw_Program program, int argc, const char* const* argv) {
     Nlw_CommandLine cl = Nlw_ParseCommandLine(program, args);
 
     if (cl.help) {
+        // "tessel -h <netlist_type>" asks for the options of that netlist
+        // type: the option list; without a known type tessel prints its
+        // overview (which ends the program).
+        static const char* const kNetlistTypes[] = {"equivalence", "ecn", "simulation",
+                                                    "sim", "static", "sta"};
+        bool known = false;
+        for (const char* type : kNetlistTypes)
+            if (UT_STR::ICompare(cl.helpTopic.c_str(), type) == 0) known = true;
+        if (program == Nlw_Program::Tessel && known) {
+            Nlw_Verilog::Help();
+            return 0;
+        }
         Nlw_Verilog help = program == Nlw_Program::Qdb2ver ? Nlw_Verilog() : Nlw_Verilog("tessel");
         help.GetHelp()();
         return 0;

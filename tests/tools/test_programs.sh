@@ -33,6 +33,8 @@ expect "qdb2ver -h exits 0" 0 "$bin/qdb2ver" -h
 contains "qdb2ver -h prints the option lines" "$work/out.txt" "-aka                Write Also-Know-As names as comments."
 expect "tessel -h exits 0" 0 "$bin/tessel" -h
 contains "tessel -h prints the overview" "$work/out.txt" "Valid netlist_types are:"
+expect "tessel -h sim exits 0" 0 "$bin/tessel" -h sim
+contains "tessel -h sim prints the options" "$work/out.txt" "-ism                Include timcell modules in verilog file."
 expect "no input file: usage, exit 2" 2 "$bin/qdb2ver"
 contains "usage names the synopsis" "$work/err.txt" "qdb2ver [-10ps] [-aka]"
 expect "unknown option: exit 2" 2 "$bin/qdb2ver" -nonsense "$work/top.json"
