@@ -12,6 +12,20 @@ bool Nlw_ICaseLess::operator()(const Port::String& a, const Port::String& b) con
     return UT_STR::ICompare(a.c_str(), b.c_str()) < 0;
 }
 
+const char* Nlw_Property::ParameterName(const char* propertyName) {
+    if (UT_STR::ICompare(propertyName, "INITSTATE") == 0 ||
+        UT_STR::ICompare(propertyName, "INIT_BIT") == 0)
+        return "INIT";
+    return propertyName;
+}
+
+const Nlw_Property* Nlw_Property::Find(const std::vector<Nlw_Property>& defs,
+                                       const char* parameterName) {
+    for (const Nlw_Property& def : defs)
+        if (UT_STR::ICompare(def.GetName().c_str(), parameterName) == 0) return &def;
+    return nullptr;
+}
+
 Nlw_NetlistWriter::Nlw_NetlistWriter() = default;
 
 Nlw_NetlistWriter::Nlw_NetlistWriter(const Nlw_NetlistWriter& other)

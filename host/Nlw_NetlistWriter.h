@@ -28,6 +28,15 @@ public:
     const Port::String& GetType() const { return type_; }
     const Port::String& GetDefault() const { return default_; }
 
+    // The parameter a property stands for: the initial-state properties of
+    // the flip-flops ("INITSTATE", "INIT_BIT") all set "INIT"; any other
+    // name stands for itself.
+    static const char* ParameterName(const char* propertyName);
+    // The definition of a parameter among defs, its name compared ignoring
+    // case; null when there is none.
+    static const Nlw_Property* Find(const std::vector<Nlw_Property>& defs,
+                                    const char* parameterName);
+
 private:
     Port::String name_, type_, default_;
 };

@@ -15,16 +15,6 @@ namespace {
 
 using Definitions = std::vector<Nlw_Property>;
 
-// The definition a parameter falls under: same name ignoring case, with
-// "INITSTATE" and "INIT_BIT" both standing for "INIT".
-const Nlw_Property* FindDefinition(const Definitions& defs, const char* name) {
-    if (UT_STR::ICompare(name, "INITSTATE") == 0 || UT_STR::ICompare(name, "INIT_BIT") == 0)
-        name = "INIT";
-    for (const Nlw_Property& def : defs)
-        if (UT_STR::ICompare(def.GetName().c_str(), name) == 0) return &def;
-    return nullptr;
-}
-
 void PrepareBlock(Nlw_NetlistWriter& nlw, Nlw_NlBlock* block, const Definitions* defs) {
     size_t count = Nlw_JsonReader::GetParameterCount(*block);
     if (count == 0) {
@@ -38,7 +28,8 @@ void PrepareBlock(Nlw_NetlistWriter& nlw, Nlw_NlBlock* block, const Definitions*
         Vdm_Property* p = props[k];
         if (defs) {
             // A parameter the table does not define is not simulatable.
-            const Nlw_Property* def = FindDefinition(*defs, p->GetName());
+            const Nlw_Property* def =
+                Nlw_Property::Find(*defs, Nlw_Property::ParameterName(p->GetName()));
             if (!def) continue;
             std::unique_ptr<Vdm_Property> converted = Nlw_Prep::Convert(*p, def->GetType().c_str());
             nlw.AddIfSimulatableProperty(block, converted ? converted.get() : p, list.get());

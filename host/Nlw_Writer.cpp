@@ -14,18 +14,10 @@
 #include "UT.h"
 #include "Vdm_Property.h"
 
-namespace {
-
-const char* OrEmpty(const char* s) {
-    return s ? s : "";
-}
-
-}  // namespace
-
 // ---- Opening and closing ---------------------------------------------------
 
 Nlw_Writer::Nlw_Writer(Nlw_NetlistWriter* nlw, const char* fileName, Port::Stream::Access access)
-    : nlw_(nlw), fileName_(OrEmpty(fileName)), access_(access) {
+    : nlw_(nlw), fileName_(UT_STR::OrEmpty(fileName)), access_(access) {
     if (access_ == Port::Stream::Memory) return;
     if (access_ != Port::Stream::Create && access_ != Port::Stream::Replace) {
         Fail("the file is not opened for writing");
@@ -179,7 +171,7 @@ void Nlw_Writer::AppendIndent() {
 }
 
 void Nlw_Writer::WriteL(const char* text) {
-    text = OrEmpty(text);
+    text = UT_STR::OrEmpty(text);
     Append(text, std::strlen(text));
     Append("\n", 1);
 }
@@ -195,7 +187,7 @@ void Nlw_Writer::WriteI(const char* text) {
 }
 
 void Nlw_Writer::Write(const char* text, int, int) {
-    text = OrEmpty(text);
+    text = UT_STR::OrEmpty(text);
     Append(text, std::strlen(text));
 }
 
@@ -247,7 +239,7 @@ unsigned char Nlw_Writer::IsExternalProperty(Vdm_Property* property, Vdm_Propert
 namespace {
 
 std::string LowerCase(const char* s) {
-    std::string out(OrEmpty(s));
+    std::string out(UT_STR::OrEmpty(s));
     for (char& c : out)
         if (c >= 'A' && c <= 'Z') c = static_cast<char>(c - 'A' + 'a');
     return out;
@@ -259,7 +251,7 @@ Vdh_PropOutFilter::Vdh_PropOutFilter(const char* path, const void* options) {
     (void)options;
     std::string content, error;
     if (!Port::File::readAll(path, content, &error)) {
-        NLW_MSG().issueWarning("Cannot read property filter file '%s': %s\n", OrEmpty(path),
+        NLW_MSG().issueWarning("Cannot read property filter file '%s': %s\n", UT_STR::OrEmpty(path),
                                error.c_str());
         return;
     }

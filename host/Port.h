@@ -26,6 +26,7 @@ void Port_AppendFormat(std::string& out, const char* format, ...)
     __attribute__((format(printf, 2, 3)))
 #endif
     ;
+void Port_AppendFormatV(std::string& out, const char* format, va_list args);
 
 namespace Port {
 
@@ -99,6 +100,8 @@ private:
 
 using String = StringBase<char>;
 
+class Stream;
+
 // An ordered list of directories.
 class PathList {
 public:
@@ -120,6 +123,15 @@ public:
     static const PathList& GetInstance();
     // Forgets the cached list so that the next GetInstance reads VORNIX again.
     static void Reset();
+
+    // The installation lookups below try root/<relative> for each root that
+    // exists and is a directory, in the list's order; the other roots are
+    // passed over.
+    // The first such path that is a directory; "" when no root holds one.
+    static std::string FindDirectory(const char* relative);
+    // Opens for reading the first such path that is a file and can be
+    // opened. Returns false when none can.
+    static bool OpenFile(const char* relative, Stream& stream);
 };
 
 class Stream {

@@ -237,6 +237,40 @@ void VornixPath::Reset() {
     if (cache.current) cache.retired.push_back(std::move(cache.current));
 }
 
+namespace {
+
+// root/<relative> for the root, or "" when the root is not an existing
+// directory.
+std::string UnderRoot(const char* root, const char* relative) {
+    if (!File::exist(root) || !File::isdir(root)) return std::string();
+    std::string path = root;
+    path += '/';
+    path += relative ? relative : "";
+    return path;
+}
+
+}  // namespace
+
+std::string VornixPath::FindDirectory(const char* relative) {
+    const PathList& roots = GetInstance();
+    for (size_t i = 0; i < roots.size(); ++i) {
+        std::string path = UnderRoot(roots[i], relative);
+        if (!path.empty() && File::exist(path.c_str()) && File::isdir(path.c_str())) return path;
+    }
+    return std::string();
+}
+
+bool VornixPath::OpenFile(const char* relative, Stream& stream) {
+    const PathList& roots = GetInstance();
+    for (size_t i = 0; i < roots.size(); ++i) {
+        std::string path = UnderRoot(roots[i], relative);
+        if (!path.empty() && File::exist(path.c_str()) && !File::isdir(path.c_str()) &&
+            File::open(path.c_str(), stream, 0))
+            return true;
+    }
+    return false;
+}
+
 }  // namespace Port
 
 // ---- Port_Env ------------------------------------------------------------

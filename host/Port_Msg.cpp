@@ -10,15 +10,7 @@ namespace {
 // that issuing one leaves the caller's vorform results alone.
 std::string FormatMessage(const char* format, va_list args) {
     std::string out;
-    if (!format) return out;
-    va_list probe;
-    va_copy(probe, args);
-    int n = std::vsnprintf(nullptr, 0, format, probe);
-    va_end(probe);
-    if (n > 0) {
-        out.resize(static_cast<size_t>(n));
-        std::vsnprintf(&out[0], out.size() + 1, format, args);
-    }
+    Port_AppendFormatV(out, format, args);
     return out;
 }
 

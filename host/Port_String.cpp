@@ -68,10 +68,9 @@ const char* vorform(const char* format, ...) {
     return result;
 }
 
-void Port_AppendFormat(std::string& out, const char* format, ...) {
+void Port_AppendFormatV(std::string& out, const char* format, va_list args) {
     if (!format) return;
-    va_list args, probe;
-    va_start(args, format);
+    va_list probe;
     va_copy(probe, args);
     int n = std::vsnprintf(nullptr, 0, format, probe);
     va_end(probe);
@@ -80,6 +79,12 @@ void Port_AppendFormat(std::string& out, const char* format, ...) {
         out.resize(old + static_cast<size_t>(n));
         std::vsnprintf(&out[old], static_cast<size_t>(n) + 1, format, args);
     }
+}
+
+void Port_AppendFormat(std::string& out, const char* format, ...) {
+    va_list args;
+    va_start(args, format);
+    Port_AppendFormatV(out, format, args);
     va_end(args);
 }
 

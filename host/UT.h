@@ -9,6 +9,8 @@
 
 class UT_STR {
 public:
+    // The text, or "" for null.
+    static const char* OrEmpty(const char* s) { return s ? s : ""; }
     static char* Copy(char* dst, const char* src);
     static char* Cat(char* dst, const char* src);
     // A heap copy (delete[] to release); null for null.

@@ -191,8 +191,7 @@ std::string Nlw_Verilog::GetSdfMHPrefix() const {
     const char* sdfPath = GetParams()->GetSdfPath();
     if (sdfPath == nullptr) return GetOutputDirectory();
     std::string prefix = sdfPath;
-    if (!prefix.empty())
-        prefix += std::string(Port::FileName::GetPathSeparator()) == "/" ? "/" : "\\";
+    if (!prefix.empty()) prefix += Port::FileName::GetPathSeparator();
     return prefix;
 }
 

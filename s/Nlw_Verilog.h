@@ -62,7 +62,6 @@ private:
     void WriteEcnHeader(Nlw_Writer* writer);
     void WriteStaHeader(Nlw_Writer* writer);
     void WriteParams(Nlw_Writer* writer);
-    void WriteUseLib(Nlw_Writer* writer);
     bool IsChipwideNeeded();
     void IssueChipwideNotice();
 

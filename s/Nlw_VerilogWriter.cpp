@@ -13,19 +13,10 @@
 
 namespace {
 
-// ASCII only: names are identifiers, and the hash and the equality must agree
-// whatever the locale.
+// ASCII only, as UT_STR::ICompare folds case: names are identifiers, and the
+// hash and the equality must agree whatever the locale.
 inline unsigned char UpperAscii(unsigned char c) {
     return (c >= 'a' && c <= 'z') ? static_cast<unsigned char>(c - 'a' + 'A') : c;
-}
-
-int ICompareAscii(const char* a, const char* b) {
-    for (;; ++a, ++b) {
-        unsigned char ca = UpperAscii(static_cast<unsigned char>(*a));
-        unsigned char cb = UpperAscii(static_cast<unsigned char>(*b));
-        if (ca != cb) return ca < cb ? -1 : 1;
-        if (ca == 0) return 0;
-    }
 }
 
 // First bucket count of the prime series at or above 100.
@@ -40,17 +31,17 @@ size_t Nlw_ICaseHash::operator()(const Port::String& s) const {
 }
 
 bool Nlw_ICaseEqual::operator()(const Port::String& a, const Port::String& b) const {
-    return a.length() == b.length() && ICompareAscii(a.c_str(), b.c_str()) == 0;
+    return a.length() == b.length() && UT_STR::ICompare(a.c_str(), b.c_str()) == 0;
 }
 
 bool Nlw_ICaseOrder::operator()(const std::string& a, const std::string& b) const {
-    return ICompareAscii(a.c_str(), b.c_str()) < 0;
+    return UT_STR::ICompare(a.c_str(), b.c_str()) < 0;
 }
 bool Nlw_ICaseOrder::operator()(const std::string& a, const char* b) const {
-    return ICompareAscii(a.c_str(), b) < 0;
+    return UT_STR::ICompare(a.c_str(), b) < 0;
 }
 bool Nlw_ICaseOrder::operator()(const char* a, const std::string& b) const {
-    return ICompareAscii(a, b.c_str()) < 0;
+    return UT_STR::ICompare(a, b.c_str()) < 0;
 }
 
 Nlw_VerilogWriter::Nlw_VerilogWriter(Nlw_NetlistWriter* nlw, const char* fileName,

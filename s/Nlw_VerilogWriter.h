@@ -52,6 +52,10 @@ public:
     void WriteExternalProperties(Vdm_Property* list, Nlw_NlBlock* block);
     void WriteDefparamStatements(Nlw_NlBlock* block);
 
+    // Writes the `uselib directive for the installation's verilog/src/<libraryName>
+    // directory to writer, or reports why it cannot.
+    static void WriteLibrarySearch(Nlw_Writer* writer, const char* libraryName);
+
     // Read access for tests.
     const std::multimap<Port::String, Port::String>& GetBigEndingTimcellMap() const {
         return bigEndingTimcellMap_;
@@ -77,7 +81,6 @@ private:
 
     // Preamble.
     void WriteNewHeader(Nlw_NlBlock* block);
-    void WriteLibrarySearch(const char* libraryName);
     void WriteSdfAnnotate(Nlw_NlBlock* block);
     // Ports, wires, instances.
     void WriteModulePortList(Nlw_NlBlock* block);

@@ -57,19 +57,9 @@ void Nlw_VerilogWriter::WriteChipwideModule() {
     const bool blackBox = IsBlackBoxMode();
     if (blackBox) WriteIL("// synthesis translate_off");
 
-    const Port::PathList& roots = Port::VornixPath::GetInstance();
-    if (roots.size() == 0) NLW_MSG().issueError("%s", kNoVornixError);
-    bool copied = false;
-    for (size_t i = 0; i < roots.size() && !copied; ++i) {
-        const char* root = roots[i];
-        if (!Port::File::exist(root) || !Port::File::isdir(root)) continue;
-        const std::string path =
-            UT_PATH::ExternalPath((std::string(root) + "/verilog/src/chipwide.v").c_str());
-        Port::Stream stream(Port::Stream::Read, 4096);
-        if (!Port::File::exist(path.c_str()) || Port::File::isdir(path.c_str()) ||
-            !Port::File::open(path.c_str(), stream, 0))
-            continue;
-        copied = true;
+    if (Port::VornixPath::GetInstance().size() == 0) NLW_MSG().issueError("%s", kNoVornixError);
+    Port::Stream stream(Port::Stream::Read, 4096);
+    if (Port::VornixPath::OpenFile("verilog/src/chipwide.v", stream)) {
         WriteL("");
         WriteIL("`ifndef CHIPWIDE");
         WriteIL("`define CHIPWIDE");
@@ -81,36 +71,26 @@ void Nlw_VerilogWriter::WriteChipwideModule() {
         WriteL("");
         WriteIL("`endif");
         WriteL("");
-    }
-    if (!copied)
+    } else {
         NLW_MSG().issueWarning(
             "chipwide.v module can't be found in directory $VORNIX/verilog/src\n");
+    }
 
     if (blackBox) WriteIL("// synthesis translate_on");
 }
 
 bool Nlw_VerilogWriter::CopyModelFile(const char* libraryName, const char* model) {
-    const Port::PathList& roots = Port::VornixPath::GetInstance();
-    for (size_t i = 0; i < roots.size(); ++i) {
-        const char* root = roots[i];
-        if (!Port::File::exist(root) || !Port::File::isdir(root)) continue;
-        std::string path = root;
-        path += "/verilog/src/";
-        path += libraryName;
-        path += '/';
-        path += model;
-        path += ".v";
-        path = UT_PATH::ExternalPath(path.c_str());
-        Port::Stream stream(Port::Stream::Read, 4096);
-        if (!Port::File::exist(path.c_str()) || Port::File::isdir(path.c_str()) ||
-            !Port::File::open(path.c_str(), stream, 0))
-            continue;
-        std::string line;
-        while (stream.readline(line)) WriteL(line.c_str());
-        WriteL("");
-        return true;
-    }
-    return false;
+    std::string relative = "verilog/src/";
+    relative += libraryName;
+    relative += '/';
+    relative += model;
+    relative += ".v";
+    Port::Stream stream(Port::Stream::Read, 4096);
+    if (!Port::VornixPath::OpenFile(relative.c_str(), stream)) return false;
+    std::string line;
+    while (stream.readline(line)) WriteL(line.c_str());
+    WriteL("");
+    return true;
 }
 
 void Nlw_VerilogWriter::WriteIsmList(Nlw_NlBlock* block, UT_NCH_CACHE& cache) {

@@ -24,10 +24,6 @@ const char* const Nlw_VerilogWriter::kNoVornixError =
 
 namespace {
 
-const char* OrEmpty(const char* text) {
-    return text ? text : "";
-}
-
 const char* DesignName(Nlw_NetlistWriter* nlw) {
     return nlw->GetDesign() ? nlw->GetDesign()->GetName() : "";
 }
@@ -66,17 +62,17 @@ void Nlw_VerilogWriter::WriteNewHeader(Nlw_NlBlock* block) {
     WriteL("//       | |");
     WriteL("//    +------+    Vendor: Vornix");
     line_ = "//  --|      |--  Version: ";
-    line_ += OrEmpty(nlw->GetApplicationVersion());
+    line_ += UT_STR::OrEmpty(nlw->GetApplicationVersion());
     WriteL(line_.c_str());
     line_ = "//  --|  VX  |--  Application: ";
-    line_ += OrEmpty(nlw->GetApplicationName());
+    line_ += UT_STR::OrEmpty(nlw->GetApplicationName());
     WriteL(line_.c_str());
     line_ = "//  --|      |--  Filename: ";
-    line_ += OrEmpty(block ? block->GetFileBaseName() : nullptr);
+    line_ += UT_STR::OrEmpty(block ? block->GetFileBaseName() : nullptr);
     line_ += ".v";
     WriteL(line_.c_str());
     line_ = "//    +------+    Timestamp: ";
-    line_ += OrEmpty(Nlw_Util::GetTimeStampString(1));
+    line_ += UT_STR::OrEmpty(Nlw_Util::GetTimeStampString(1));
     WriteL(line_.c_str());
     WriteL("//       | |");
     WriteL("//");
@@ -134,36 +130,26 @@ void Nlw_VerilogWriter::WriteNewHeader(Nlw_NlBlock* block) {
 
     WriteL(params->GetWritePsTimePrecision() ? "`timescale 1 ns/1 ps" : "`timescale 1 ns/10 ps");
     if (params->GetWriteUseLib())
-        WriteLibrarySearch(params->GetFuncellMode() ? "funcells" : "timcells");
+        WriteLibrarySearch(this, params->GetFuncellMode() ? "funcells" : "timcells");
     WriteL("");
 }
 
-void Nlw_VerilogWriter::WriteLibrarySearch(const char* libraryName) {
-    const Port::PathList& roots = Port::VornixPath::GetInstance();
-    bool found = false;
-    if (roots.size() == 0) {
+void Nlw_VerilogWriter::WriteLibrarySearch(Nlw_Writer* writer, const char* libraryName) {
+    // The directive names the first installation root that holds the
+    // library's sources; without one it is left out and the user is told why.
+    if (Port::VornixPath::GetInstance().size() == 0) {
         NLW_MSG().issueError("%s", kNoVornixError);
     } else {
-        for (size_t i = 0; i < roots.size() && !found; ++i) {
-            const char* root = roots[i];
-            if (!Port::File::exist(root) || !Port::File::isdir(root)) continue;
-            std::string dir = root;
-            dir += "/verilog/src/";
-            dir += libraryName;
-            dir = UT_PATH::ExternalPath(dir.c_str());
-            if (Port::File::exist(dir.c_str()) && Port::File::isdir(dir.c_str())) {
-                line_ = "`uselib dir=";
-                line_ += dir;
-                line_ += " libext=.v";
-                WriteL(line_.c_str());
-                found = true;
-            }
+        const std::string dir =
+            Port::VornixPath::FindDirectory(vorform("verilog/src/%s", libraryName));
+        if (!dir.empty()) {
+            writer->WriteL(vorform("`uselib dir=%s libext=.v", dir.c_str()));
+            return;
         }
     }
-    if (!found)
-        NLW_MSG().issueError(
-            "Timcell library directory not found, the `uselib constructis omitted for the -ul "
-            "option.\n");
+    NLW_MSG().issueError(
+        "Timcell library directory not found, the `uselib constructis omitted for the -ul "
+        "option.\n");
 }
 
 void Nlw_VerilogWriter::WriteSdfAnnotate(Nlw_NlBlock* block) {
@@ -172,9 +158,9 @@ void Nlw_VerilogWriter::WriteSdfAnnotate(Nlw_NlBlock* block) {
         Port_Env::GetEnv("VOR_SIMMODEL_DISABLE_SDF_ANNOTATE"))
         return;
 
-    std::string name = OrEmpty(params->GetSdfPath());
+    std::string name = UT_STR::OrEmpty(params->GetSdfPath());
     if (!name.empty()) name += '/';
-    name += OrEmpty(block->GetFileBaseName());
+    name += UT_STR::OrEmpty(block->GetFileBaseName());
     name += ".sdf";
     name = UT_PATH::InternalPath(name.c_str());
 
@@ -207,7 +193,8 @@ void Nlw_VerilogWriter::WriteMHHeader(Nlw_NlBlock* block) {
     Nlw_Params* params = GetParams();
 
     WriteL(vorform("// Vornix Verilog netlist produced by %s application (version %s)",
-                   OrEmpty(nlw->GetApplicationName()), OrEmpty(nlw->GetApplicationVersion())));
+                   UT_STR::OrEmpty(nlw->GetApplicationName()),
+                   UT_STR::OrEmpty(nlw->GetApplicationVersion())));
     WriteL("// This netlist is one of multiple netlists created for the");
     WriteL("// design using tessel's write multiple hierarchy files option.");
     WriteL("");
@@ -227,6 +214,6 @@ void Nlw_VerilogWriter::WriteMHHeader(Nlw_NlBlock* block) {
     WriteL("");
 
     WriteL(params->GetWritePsTimePrecision() ? "`timescale 1 ns/1 ps" : "`timescale 1 ns/10 ps");
-    if (params->GetWriteUseLib()) WriteLibrarySearch("timcells");
+    if (params->GetWriteUseLib()) WriteLibrarySearch(this, "timcells");
     WriteL("");
 }

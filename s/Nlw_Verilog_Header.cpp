@@ -3,8 +3,8 @@
 #include "../host/Nlw_Util.h"
 #include "../host/Nlw_Writer.h"
 #include "../host/Port.h"
-#include "../host/UT.h"
 #include "Nlw_Verilog.h"
+#include "Nlw_VerilogWriter.h"
 
 namespace {
 
@@ -30,36 +30,9 @@ void Nlw_Verilog::WriteHeader(Nlw_Writer* writer) {
 
     writer->WriteL(params->GetWritePsTimePrecision() ? "`timescale 1 ns/1 ps"
                                                      : "`timescale 1 ns/10 ps");
-    if (params->GetWriteUseLib()) WriteUseLib(writer);
+    if (params->GetWriteUseLib()) Nlw_VerilogWriter::WriteLibrarySearch(writer, "timcells");
     if (IsChipwideNeeded() && !params->GetWriteTestFile()) IssueChipwideNotice();
     writer->WriteL("");
-}
-
-// The library directive names the first installation root that holds the
-// timcell sources; without one the directive is left out and the user is
-// told why.
-void Nlw_Verilog::WriteUseLib(Nlw_Writer* writer) {
-    const Port::PathList roots = Port::VornixPath::GetInstance();
-    if (roots.size() == 0) {
-        NLW_MSG().issueError(
-            " The VORNIX environment variable must be set for this program towork. Please "
-            "check your environment to ensure that it is setup properly to use the Vornix "
-            "tools\n");
-    } else {
-        for (size_t i = 0; i < roots.size(); ++i) {
-            const char* root = roots[i];
-            if (!Port::File::exist(root) || !Port::File::isdir(root)) continue;
-            const std::string candidate =
-                UT_PATH::ExternalPath(vorform("%s/verilog/src/timcells", root));
-            if (Port::File::exist(candidate.c_str()) && Port::File::isdir(candidate.c_str())) {
-                writer->WriteL(vorform("`uselib dir=%s libext=.v", candidate.c_str()));
-                return;
-            }
-        }
-    }
-    NLW_MSG().issueError(
-        "Timcell library directory not found, the `uselib constructis omitted for the -ul "
-        "option.\n");
 }
 
 void Nlw_Verilog::WriteSimHeader(Nlw_Writer* writer) {

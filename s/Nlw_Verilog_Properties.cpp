@@ -6,7 +6,6 @@
 
 #include "../host/Nlw_Nl.h"
 #include "../host/Port.h"
-#include "../host/UT.h"
 #include "../host/Vdm_Property.h"
 #include "Nlw_Verilog.h"
 
@@ -16,26 +15,13 @@ bool TypeIs(const Nlw_Property& definition, const char* type) {
     return definition.GetType().Compare(type, Port::String::IgnoreCase) == 0;
 }
 
-// The parameter a property stands for: the initial-state properties of the
-// flip-flops all set the library's INIT parameter.
-Port::String ParameterName(const char* propertyName) {
-    if (UT_STR::ICompare(propertyName, "INITSTATE") == 0 ||
-        UT_STR::ICompare(propertyName, "INIT_BIT") == 0)
-        return Port::String("INIT");
-    return Port::String(propertyName);
-}
-
 const Nlw_Property* FindDefinition(const Nlw_SimPropTable& table, const char* typeName,
                                    const Port::String& parameterName) {
     // The table orders its keys ignoring case, so find gives the entry whose
     // key equals the type name ignoring case.
     const auto entry = table.find(Port::String(typeName));
     if (entry == table.end() || entry->second == nullptr) return nullptr;
-    for (const Nlw_Property& definition : *entry->second) {
-        if (definition.GetName().Compare(parameterName.c_str(), Port::String::IgnoreCase) == 0)
-            return &definition;
-    }
-    return nullptr;
+    return Nlw_Property::Find(*entry->second, parameterName.c_str());
 }
 
 // A sized vector literal such as 16'hABCD or 4'b0101. The width comes from the
@@ -75,7 +61,7 @@ Port::String MakeVectorText(Nlw_NetlistWriter& nlw, const Nlw_Property& definiti
 unsigned char Nlw_Verilog::AddIfSimulatableProperty(Nlw_NlBlock* block, Vdm_Property* property,
                                                     Vdm_Property* list) {
     if (block == nullptr || property == nullptr || list == nullptr) return 0;
-    const Port::String name = ParameterName(property->GetName());
+    const Port::String name = Nlw_Property::ParameterName(property->GetName());
     const Nlw_Property* definition = FindDefinition(simPropTable, block->GetTypeName(), name);
     if (definition == nullptr) return 0;
 

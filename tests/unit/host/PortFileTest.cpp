@@ -149,6 +149,31 @@ TEST(VornixPath, CachedUntilReset) {
     EXPECT_STREQ(before[0], "/first");
 }
 
+TEST(VornixPath, LooksUpInTheFirstRootHoldingThePath) {
+    TempDir dir;
+    // r0 is a file, not a root; r1 holds "lib" as a file and "m.v" as a
+    // directory, so both lookups must go on to r2.
+    WriteFile(dir / "r0", "x");
+    MakeDirs(dir / "r1/src/m.v");
+    WriteFile(dir / "r1/src/lib", "x");
+    MakeDirs(dir / "r2/src/lib");
+    WriteFile(dir / "r2/src/m.v", "second\n");
+    MakeDirs(dir / "r3/src");
+    WriteFile(dir / "r3/src/m.v", "third\n");
+    const std::string roots = (dir / "none") + ":" + (dir / "r0") + ":" + (dir / "r1") + ":" +
+                              (dir / "r2") + ":" + (dir / "r3");
+    EnvSetting v("VORNIX", roots.c_str());
+
+    EXPECT_EQ(Port::VornixPath::FindDirectory("src/lib"), dir / "r2/src/lib");
+    EXPECT_EQ(Port::VornixPath::FindDirectory("src/missing"), "");
+    Port::Stream stream(Port::Stream::Read, 4096);
+    ASSERT_TRUE(Port::VornixPath::OpenFile("src/m.v", stream));
+    std::string line;
+    ASSERT_TRUE(stream.readline(line));
+    EXPECT_EQ(line, "second");
+    EXPECT_FALSE(Port::VornixPath::OpenFile("src/none.v", stream));
+}
+
 TEST(PortEnv, DataFileFromTheFirstRootHoldingIt) {
     TempDir dir;
     MakeDirs(dir / "r1/data");
