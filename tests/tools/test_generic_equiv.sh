@@ -1,7 +1,8 @@
 #!/usr/bin/env bash
 # Netlists written from yosys's generic gate and lookup-table mappings of
 # small RTL designs are accepted by Icarus Verilog, Verilator and yosys, and
-# yosys proves each equivalent to its RTL (with and without escaped names).
+# yosys proves each equivalent to its RTL (with and without escaped names,
+# and flattened).
 set -uo pipefail
 src=${NLW_SRC:-$(cd "$(dirname "$0")/../.." && pwd)}
 bin=${NLW_BIN:-$src/build}
@@ -41,9 +42,10 @@ for rtl in "$src"/tests/tools/generic/*.v; do
         [ $flavour = lut4 ] && script="$script -lut 4"
         json="$work/$top.$flavour.json"
         yosys -q -p "$script; write_json $json" || { echo "FAIL yosys synth $top"; fail=1; continue; }
-        for names in escaped plain; do
+        for names in escaped plain flat; do
             opts="-w -insert_chipwide false"
             [ $names = plain ] && opts="$opts -ne"
+            [ $names = flat ] && opts="$opts -fn"
             net="$work/$top.$flavour.$names.v"
             tag="$top/$flavour/$names"
             check "$tag: qdb2ver" "$bin/qdb2ver" $opts "$json" "$net"
