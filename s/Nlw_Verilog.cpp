@@ -8,7 +8,10 @@
 #include "../host/Nlw_Nl_LU.h"
 #include "../host/Port.h"
 #include "../host/UT.h"
+#include "Nlw_PcsWriter.h"
+#include "Nlw_PinWriter.h"
 #include "Nlw_VerilogLU.h"
+#include "Nlw_VerilogTestWriter.h"
 #include "Nlw_VerilogWriter.h"
 
 namespace {
@@ -172,8 +175,10 @@ void Nlw_Verilog::WriteISMFile() {
 }
 
 // ---------------------------------------------------------------------------
-// Drivers whose writers are not part of this library yet. Each forms its file
-// name already; announcing and writing the file come with its writer.
+// Drivers of the other files. The timing, assertion and hierarchy
+// information files are written by host writers this host does not have
+// yet: their drivers form the file names only, and announce and write
+// nothing.
 
 std::string Nlw_Verilog::GetSdfFileName() const {
     const char* sdfPath = GetParams()->GetSdfPath();
@@ -221,14 +226,16 @@ void Nlw_Verilog::WriteSdfMHFile() {
 
 void Nlw_Verilog::WritePinFile() {
     const std::string fileName = GetRootFileName(".pin");
-    // The pin map writer comes later.
-    (void)fileName;
+    NLW_MSG().issueStatus("Writing pin file '%s' ...\n", fileName.c_str());
+    Nlw_PinWriter writer(this, fileName.c_str(), GetParams()->GetOutputFileMode());
+    writer.WriteView(GetView(), 0);
 }
 
 void Nlw_Verilog::WriteVerilogTestFile() {
     const std::string fileName = GetRootFileName(".tv");
-    // The test fixture writer comes later.
-    (void)fileName;
+    NLW_MSG().issueStatus("Writing Verilog test file '%s' ...\n", fileName.c_str());
+    Nlw_VerilogTestWriter writer(this, fileName.c_str(), GetParams()->GetOutputFileMode());
+    writer.WriteView(GetView(), 0);
 }
 
 void Nlw_Verilog::WriteAssertionFile() {
@@ -247,6 +254,7 @@ void Nlw_Verilog::WriteMHFInfoFile() {
 
 void Nlw_Verilog::WritePcsFile() {
     const std::string fileName = GetRootFileName(".pcs");
-    // The translation file writer comes later.
-    (void)fileName;
+    NLW_MSG().issueStatus("Writing PCS file '%s' ...\n", fileName.c_str());
+    Nlw_PcsWriter writer(this, fileName.c_str(), GetParams()->GetOutputFileMode());
+    writer.WriteView(GetView(), 0);
 }

@@ -71,4 +71,48 @@ if cmp -s "$work/top.v" "$work/first.v"; then echo "ok   the same design gives t
 
 expect "-tm renames the top module" 0 "$bin/qdb2ver" -w -tm chip "$work/top.json" "$work/chip.v"
 contains "the module is named chip" "$work/chip.v" "module chip"
+
+# The pin map: pad cells on the top-level ports, their package pins from the
+# cell's PINNAME or LOC or from the LOC of the port's net. Without pad
+# buffers the pad pins sit on the ports themselves; output pads drive
+# nothing and are kept explicitly.
+mkdir -p "$work/pins"
+cat > "$work/pins/chip.v" <<'V'
+module sub(input a, input b, output y); assign y = a & b; endmodule
+module chip(input clk, input [1:0] d, output q, (* LOC = "P9" *) output z);
+  (* LOC = "P1" *) V_IPAD p_clk(.PAD(clk));
+  (* PINNAME = "P2" *) V_IPAD p_d0(.PAD(d[0]));
+  (* LOC = "P3" *) V_IPAD p_d1(.PAD(d[1]));
+  (* keep, LOC = "P4" *) V_OPAD p_q(.PAD(q));
+  (* keep *) V_OPAD p_z(.PAD(z));
+  reg r; always @(posedge clk) r <= d[0];
+  assign q = r;
+  sub u(.a(d[0]), .b(d[1]), .y(z));
+endmodule
+V
+expect "rtl2json maps the pad design" 0 \
+    "$src/flow/rtl2json" -noiopad -part vx100-fg256-5 chip "$work/pins/chip.json" "$work/pins/chip.v"
+expect "qdb2ver -pf writes the pin map" 0 "$bin/qdb2ver" -pf -w "$work/pins/chip.json"
+contains "the pin file is announced" "$work/out.txt" "Writing pin file '$work/pins/chip.pin' ..."
+contains "the pin file names the design" "$work/pins/chip.pin" "// Design name: chip"
+contains "the part loses its family prefix" "$work/pins/chip.pin" "// Part 100"
+for port in clk 'd[0]' 'd[1]' q z; do
+    n=$(awk -F'\t' -v p="$port" 'NF == 3 { sub(/ +$/, "", $1); if ($1 == p) n++ } END { print n + 0 }' \
+        "$work/pins/chip.pin")
+    if [ "$n" = 1 ]; then echo "ok   port $port is listed once"; else
+        echo "FAIL port $port is listed $n times"; cat "$work/pins/chip.pin"; fail=1; fi
+done
+lines=$(grep -c $'\t' "$work/pins/chip.pin")
+if [ "$lines" = 5 ]; then echo "ok   one line per pad"; else echo "FAIL $lines pin lines, expected 5"; fail=1; fi
+contains "a pad pin from the net's LOC" "$work/pins/chip.pin" "$(printf '%-20s\t%-10s\t%-10s' z INPUT P9)"
+contains "an input pad's pin is an output" "$work/pins/chip.pin" "$(printf '%-20s\t%-10s\t%-10s' 'd[0]' OUTPUT P2)"
+
+# The test fixture compiles together with the netlist it was written for.
+expect "-tf writes a test fixture: exit 0" 0 "$bin/qdb2ver" -tf -w "$work/top.json" "$work/fixture.v"
+if [ -s "$work/fixture.tv" ]; then echo "ok   the fixture is the netlist root with .tv"; else
+    echo "FAIL no test fixture"; fail=1; fi
+expect "iverilog compiles netlist and fixture" 0 iverilog -g2005 -o "$work/fixture.vvp" -s test \
+    -s chipwide "$work/fixture.v" "$work/fixture.tv" "$datdir/simcells.v"
+expect "the fixture simulates" 0 vvp -n "$work/fixture.vvp"
+contains "the fixture prints its column header" "$work/out.txt" "           T "
 exit $fail

@@ -149,7 +149,7 @@ TEST_F(VerilogFlow, MultipleHierarchyWritesOneFilePerModuleType) {
     }
 }
 
-TEST_F(VerilogFlow, RequestsOfFilesWithoutWritersLeaveTheNetlistAlone) {
+TEST_F(VerilogFlow, RequestedFilesAreWrittenBesideTheNetlist) {
     params.SetWriteSdfFile(true);
     params.SetInputFileType("qda");
     params.SetWritePinFile(true);
@@ -157,7 +157,7 @@ TEST_F(VerilogFlow, RequestsOfFilesWithoutWritersLeaveTheNetlistAlone) {
     params.SetStaMode(true);
     params.SetSimMode(false);
     nlw.WriteDesign();
-    EXPECT_EQ(Files(), std::vector<std::string>{"top.v"});
+    EXPECT_EQ(Files(), (std::vector<std::string>{"top.pcs", "top.pin", "top.tv", "top.v"}));
 }
 
 TEST_F(VerilogFlow, NothingToWriteWithoutAView) {

@@ -1,0 +1,544 @@
+// The test fixture writer: file head, port declarations, unit under test,
+// waveform dumps, the column header with its monitor and the stimulus.
+#include <algorithm>
+#include <fstream>
+#include <iterator>
+#include <string>
+#include <vector>
+
+#include "Nlw_VerilogTestWriter.h"
+#include "VerilogWriterTest.h"
+
+namespace {
+
+using vwtest::ScopedEnv;
+using vwtest::TempDir;
+
+const char* const kNoVornix =
+    " The VORNIX environment variable must be set for this program towork. Please check your "
+    "environment to ensure that it is setup properly to use the Vornix tools\n";
+
+class VerilogTestWriter : public vwtest::WriterTest {
+protected:
+    VerilogTestWriter() { params_.SetCommandLine("qdb2ver -tf top.json"); }
+
+    Nlw_NlBlock* Root() { return top_ = b_.CreateRoot(b_.AddModuleType("top"), "top"); }
+
+    // The fixture module alone.
+    std::string Fixture() {
+        Nlw_VerilogTestWriter writer(&nlw_, "memory.tv", Port::Stream::Memory);
+        writer.WriteBlock(top_);
+        return writer.GetMemoryText();
+    }
+    // The whole file.
+    std::string File() {
+        Nlw_VerilogTestWriter writer(&nlw_, "memory.tv", Port::Stream::Memory);
+        writer.WriteView(&view_, 0);
+        return writer.GetMemoryText();
+    }
+    // The texts between the quotes of the $display lines.
+    std::vector<std::string> HeaderRows() {
+        std::vector<std::string> rows;
+        const std::string text = Fixture();
+        const std::string open = "$display(\"";
+        for (size_t pos = text.find(open); pos != std::string::npos;
+             pos = text.find(open, pos + 1)) {
+            const size_t begin = pos + open.size();
+            rows.push_back(text.substr(begin, text.find("\");\n", begin) - begin));
+        }
+        return rows;
+    }
+    std::string MonitorLine() {
+        const std::string text = Fixture();
+        const size_t begin = text.find("$monitor");
+        return text.substr(begin, text.find('\n', begin) - begin);
+    }
+    // The stimulus block, the module's last initial block.
+    std::string Stimulus() {
+        const std::string text = Fixture();
+        const size_t begin = text.rfind("    initial begin\n");
+        return text.substr(begin, text.find("  endmodule") - begin);
+    }
+
+    // A global signal of the root with its connection value and floating
+    // value.
+    Nlw_NlSignal* Global(const char* name, bool setReset, int conn, int floatVal) {
+        Nlw_NlSignal* s = b_.AddSignal(top_, name);
+        if (setReset)
+            b_.SetSetReset(s);
+        else
+            b_.SetTristate(s);
+        s->AddProperty(
+            Vdm_Property::NewInt(setReset ? "NLW_SETRESET_CONN" : "NLW_TRISTATE_CONN", conn));
+        b_.GetOrCreateNetwork(s)->AddProperty(Vdm_Property::NewInt("VL_FLOATVAL", floatVal));
+        return s;
+    }
+
+    Nlw_NlBlock* top_ = nullptr;
+};
+
+TEST_F(VerilogTestWriter, WholeFileOfASmallDesign) {
+    const std::string chipwide = root_.File("verilog/src/chipwide.v", "module chipwide;\n");
+    Root();
+    b_.AddPort(top_, "clk", NLW_DIR_INPUT);
+    b_.AddPortBus(top_, "d", NLW_DIR_INPUT, 7, 0);
+    b_.AddPort(top_, "q", NLW_DIR_OUTPUT);
+    b_.AddPortBus(top_, "cnt", NLW_DIR_OUTPUT, 8, 0);
+    Global("GSR", true, 3, 0);
+
+    EXPECT_EQ(File(),
+              "////////////////////////////////////////////////////////////////////////////////\n"
+              "// Copyright (c) Vornix. All rights reserved.\n"
+              "////////////////////////////////////////////////////////////////////////////////\n"
+              "//\n"
+              "//       | |\n"
+              "//    +------+    Vendor: Vornix\n"
+              "//  --|      |--  Version: 0.1\n"
+              "//  --|  VX  |--  Application: qdb2ver\n"
+              "//  --|      |--  Timestamp: Thu Jan  1 00:00:00 2026\n"
+              "//    +------+\n"
+              "//       | |\n"
+              "//\n"
+              "//             \n"
+              "// Command: qdb2ver -tf top.json\n"
+              "// Design Name: demo\n"
+              "//             \n"
+              "// Purpose:    \n"
+              "//     Vornix TestFixture Template produced by program qdb2ver 0.1\n"
+              "//             \n"
+              "//     ATTENTION: This file was created by qdb2ver and may therefore be \n"
+              "//     overwritten by subsequent runs of qdb2ver. Vornix recommends that you \n"
+              "//     copy this file to a new name, or 'paste' this text into another file, \n"
+              "//     to avoid accidental loss of data.\n"
+              "//             \n"
+              "////////////////////////////////////////////////////////////////////////////////\n"
+              "\n"
+              "`include \"" +
+                  chipwide +
+                  "\"\n"
+                  "`timescale 1 ns/1 ps\n"
+                  "\n"
+                  "  module test;\n"
+                  "    reg clk;\n"
+                  "    wire q;\n"
+                  "    reg [7 : 0] d;\n"
+                  "    wire [8 : 0] cnt;\n"
+                  "    reg GSR;\n"
+                  "    assign chipwide.GSR = GSR;\n"
+                  "    top uut (\n"
+                  "      .clk (clk),\n"
+                  "      .q (q),\n"
+                  "      .d (d),\n"
+                  "      .cnt (cnt)\n"
+                  "    );\n"
+                  "    initial begin\n"
+                  "      $display(\"           T cqd c  \");\n"
+                  "      $display(\"           i l [ n  \");\n"
+                  "      $display(\"           m k 7 t  \");\n"
+                  "      $display(\"           e     [  \");\n"
+                  "      $display(\"               : 8  \");\n"
+                  "      $display(\"                    \");\n"
+                  "      $display(\"               0 :  \");\n"
+                  "      $display(\"               ]    \");\n"
+                  "      $display(\"                 0  \");\n"
+                  "      $display(\"                 ]  \");\n"
+                  "      $monitor(\"%t\",$realtime,,clk,q,\"%h\",d,\"%h\",cnt);\n"
+                  "    end\n"
+                  "    initial begin\n"
+                  "        GSR = 1;\n"
+                  "      #100\n"
+                  "        GSR = 0;\n"
+                  "      #1000 $stop;\n"
+                  "      // #1000 $finish;\n"
+                  "    end\n"
+                  "  endmodule\n");
+}
+
+// ---------------------------------------------------------------------------
+// File head
+
+TEST_F(VerilogTestWriter, IncludeComesFromTheFirstRootHoldingTheChipwideFile) {
+    TempDir dirs;
+    const std::string plainFile = dirs.File("plain", "not a directory");
+    const std::string empty = dirs.Dir("empty");
+    dirs.Dir("dirAsFile/verilog/src/chipwide.v");
+    const std::string good = dirs.File("good/verilog/src/chipwide.v", "");
+    dirs.File("later/verilog/src/chipwide.v", "");
+    const std::string list = dirs.Path() + "/missing:" + plainFile + ":" + empty + ":" +
+                             dirs.Path() + "/dirAsFile:" + dirs.Path() + "/good:" + dirs.Path() +
+                             "/later";
+    ScopedEnv vornix("VORNIX", list.c_str());
+    Root();
+    Port_MsgCapture capture;
+    const std::string text = File();
+    EXPECT_NE(text.find("\n\n`include \"" + good + "\"\n`timescale 1 ns/1 ps\n\n  module test;\n"),
+              std::string::npos)
+        << text;
+    EXPECT_EQ(text.find("later"), std::string::npos);
+    EXPECT_TRUE(capture.msgs.empty());
+}
+
+TEST_F(VerilogTestWriter, NoIncludeWithoutTheChipwideFileOrWithoutRoots) {
+    Root();
+    params_.SetWritePsTimePrecision(false);
+    {
+        // Roots without the file: silently no include.
+        Port_MsgCapture capture;
+        const std::string text = File();
+        EXPECT_EQ(text.find("`include"), std::string::npos);
+        EXPECT_NE(text.find("///\n\n`timescale 1 ns/10 ps\n\n  module test;\n"), std::string::npos)
+            << text;
+        EXPECT_TRUE(capture.msgs.empty());
+    }
+    {
+        // No roots at all: an error, and the file goes on.
+        ScopedEnv vornix("VORNIX", "");
+        Port_MsgCapture capture;
+        const std::string text = File();
+        EXPECT_EQ(text.find("`include"), std::string::npos);
+        EXPECT_NE(text.find("  endmodule\n"), std::string::npos);
+        ASSERT_EQ(capture.msgs.size(), 1u);
+        EXPECT_EQ(capture.msgs[0].level, Port_MsgLevel::Error);
+        EXPECT_EQ(capture.msgs[0].domain, "NetListWriters");
+        EXPECT_EQ(capture.msgs[0].text, kNoVornix);
+    }
+}
+
+TEST_F(VerilogTestWriter, HeadFieldsStayInsideTheirComments) {
+    Root();
+    params_.SetCommandLine("qdb2ver \"x\nmodule evil;\"");
+    const std::string text = File();
+    EXPECT_NE(text.find("// Command: qdb2ver \"x module evil;\"\n"), std::string::npos) << text;
+    EXPECT_EQ(text.find("\nmodule evil"), std::string::npos);
+}
+
+// ---------------------------------------------------------------------------
+// Declarations and the unit under test
+
+TEST_F(VerilogTestWriter, InputsAreRegistersAndEverythingElseWires) {
+    Root();
+    b_.AddPort(top_, "i", NLW_DIR_INPUT);
+    b_.AddPort(top_, "o", NLW_DIR_OUTPUT);
+    b_.AddPort(top_, "io", NLW_DIR_INOUT);
+    b_.AddPort(top_, "u", NLW_DIR_UNTYPED);
+    b_.AddPortBus(top_, "bi", NLW_DIR_INPUT, 3, 0);
+    b_.AddPortBus(top_, "bo", NLW_DIR_OUTPUT, 0, 3);
+    b_.AddPortBus(top_, "bio", NLW_DIR_INOUT, 1, 0);
+    b_.SetVisible(b_.AddPort(top_, "hidden", NLW_DIR_INPUT), false);
+    b_.SetValid(b_.AddPortBus(top_, "gone", NLW_DIR_INPUT, 1, 0), false);
+    b_.AddPort(top_, "a b", NLW_DIR_INPUT);
+    const std::string text = Fixture();
+    EXPECT_EQ(text.substr(0, text.find("    top ")),
+              "  module test;\n"
+              "    reg i;\n"
+              "    wire o;\n"
+              "    wire io;\n"
+              "    wire u;\n"
+              "    reg \\a b ;\n"
+              "    reg [3 : 0] bi;\n"
+              "    wire [0 : 3] bo;\n"
+              "    wire [1 : 0] bio;\n");
+}
+
+TEST_F(VerilogTestWriter, OnlyGlobalsReachedThroughChipwideGetARegister) {
+    Root();
+    Global("GSR", true, 3, 0);
+    Global("GTS", false, 3, 0);
+    EXPECT_NE(Fixture().find("    reg GSR;\n"
+                             "    assign chipwide.GSR = GSR;\n"
+                             "    reg GTS;\n"
+                             "    assign chipwide.GTS = GTS;\n"
+                             "    top uut (\n"),
+              std::string::npos);
+
+    for (int conn : {0, 1, 2}) {
+        SCOPED_TRACE(conn);
+        Nlw_NlView view;
+        Nlw_NlBuilder b(&view);
+        top_ = b.CreateRoot(b.AddModuleType("top"), "top");
+        Nlw_NlSignal* s = b.AddSignal(top_, "GSR");
+        b.SetSetReset(s);
+        s->AddProperty(Vdm_Property::NewInt("NLW_SETRESET_CONN", conn));
+        const std::string text = Fixture();
+        EXPECT_EQ(text.find("chipwide"), std::string::npos);
+        EXPECT_EQ(text.find("reg GSR"), std::string::npos);
+    }
+}
+
+TEST_F(VerilogTestWriter, UnitUnderTestNameAndPortMaps) {
+    Root();
+    {
+        // No ports: still the opening line, an empty line and the closing.
+        const std::string text = Fixture();
+        EXPECT_NE(text.find("  module test;\n    top uut (\n\n    );\n    initial begin\n"),
+                  std::string::npos)
+            << text;
+        EXPECT_EQ(HeaderRows(), (std::vector<std::string>{"           T ", "           i ",
+                                                          "           m ", "           e "}));
+        EXPECT_EQ(MonitorLine(), "$monitor(\"%t\",$realtime,,);");
+    }
+    b_.AddPortBus(top_, "d", NLW_DIR_INPUT, 1, 0);
+    b_.AddPort(top_, "a-b", NLW_DIR_OUTPUT);
+    params_.SetRootInstanceName("dut 1");
+    const std::string text = Fixture();
+    EXPECT_NE(text.find("    top \\dut 1  (\n"
+                        "      .\\a-b  (\\a-b ),\n"
+                        "      .d (d)\n"
+                        "    );\n"),
+              std::string::npos)
+        << text;
+}
+
+// ---------------------------------------------------------------------------
+// Waveform dumps
+
+TEST_F(VerilogTestWriter, DumpBlocksFollowTheOptionsShmFirst) {
+    Root();
+    params_.SetOutputFileName("out/top.v");
+    const std::string shm =
+        "    initial begin\n"
+        "      $timeformat(-9,3,\"ns\",12);\n"
+        "      $shm_open(\"out/top.shm\");\n"
+        "      $shm_probe(\"AS\");\n"
+        "    end\n";
+    const std::string vcd =
+        "    initial begin\n"
+        "      $timeformat(-9,3,\"ns\",12);\n"
+        "      $dumpfile(\"out/top.vcd\");\n"
+        "      $dumpvars(0, test);\n"
+        "    end\n";
+    const std::string uutEnd = "    );\n";
+    const std::string display = "    initial begin\n      $display(";
+    struct Case {
+        bool shm, vcd;
+        std::string blocks;
+    };
+    for (const Case& c : {Case{false, false, ""}, Case{true, false, shm}, Case{false, true, vcd},
+                          Case{true, true, shm + vcd}}) {
+        SCOPED_TRACE(c.blocks);
+        params_.SetWriteShm(c.shm);
+        params_.SetWriteVcd(c.vcd);
+        EXPECT_NE(Fixture().find(uutEnd + c.blocks + display), std::string::npos);
+    }
+}
+
+TEST_F(VerilogTestWriter, DumpNamesAreEscapedInsideTheirStringLiterals) {
+    Root();
+    params_.SetOutputFileName("run \"1\"\\x.v");
+    params_.SetWriteShm(true);
+    params_.SetWriteVcd(true);
+    const std::string text = Fixture();
+    EXPECT_NE(text.find("      $shm_open(\"run \\\"1\\\"\\\\x.shm\");\n"), std::string::npos)
+        << text;
+    EXPECT_NE(text.find("      $dumpfile(\"run \\\"1\\\"\\\\x.vcd\");\n"), std::string::npos);
+}
+
+// ---------------------------------------------------------------------------
+// Column header and monitor
+
+TEST_F(VerilogTestWriter, BusColumnsAreTheHexDigitsOfTheBus) {
+    Root();
+    struct Case {
+        int msb, lsb, columns;
+    };
+    const Case cases[] = {{0, 0, 1},  {3, 0, 1},  {4, 1, 1}, {4, 0, 2}, {7, 0, 2},   {8, 0, 3},
+                          {15, 0, 4}, {16, 0, 5}, {9, 2, 2}, {0, 7, 2}, {-1, -9, 3}, {0, 8, 3}};
+    int n = 0;
+    for (const Case& c : cases) {
+        const Nlw_NlPinBus* bus =
+            b_.AddPortBus(top_, vorform("b%d", n++), NLW_DIR_INPUT, c.msb, c.lsb);
+        EXPECT_EQ(Nlw_VerilogTestWriter::GetBusColumns(bus), c.columns)
+            << "[" << c.msb << ":" << c.lsb << "]";
+    }
+}
+
+TEST_F(VerilogTestWriter, RowsUnderABusArePaddedByItsWidth) {
+    struct Case {
+        int msb;
+        std::vector<std::string> rows;
+    };
+    // 8 bits take two columns, 9 bits three, also in the rows below the
+    // bus's label: the next bus stands right of them in every row.
+    const Case cases[] = {
+        {7,
+         {"           T ad e", "           i b[ [", "           m c7 0", "           e d   ",
+          "             e: :", "             f   ", "             g0 0", "             h] ]",
+          "             i   ", "             j   "}},
+        {8,
+         {"           T ad  e", "           i b[  [", "           m c8  0", "           e d    ",
+          "             e:  :", "             f    ", "             g0  0", "             h]  ]",
+          "             i    ", "             j    "}},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.msb);
+        Nlw_NlView view;
+        Nlw_NlBuilder b(&view);
+        top_ = b.CreateRoot(b.AddModuleType("top"), "top");
+        b.AddPortBus(top_, "d", NLW_DIR_INPUT, c.msb, 0);
+        b.AddPortBus(top_, "e", NLW_DIR_OUTPUT, 0, 0);
+        b.AddPort(top_, "abcdefghij", NLW_DIR_OUTPUT);
+        EXPECT_EQ(HeaderRows(), c.rows);
+        EXPECT_EQ(MonitorLine(), "$monitor(\"%t\",$realtime,,abcdefghij,\"%h\",d,\"%h\",e);");
+    }
+}
+
+TEST_F(VerilogTestWriter, LongerLaterNamesStartRowsAlignedWithEarlierColumns) {
+    Root();
+    b_.AddPort(top_, "a", NLW_DIR_INPUT);
+    b_.AddPort(top_, "bb", NLW_DIR_INPUT);
+    b_.AddPort(top_, "longer", NLW_DIR_OUTPUT);
+    b_.AddPort(top_, "c", NLW_DIR_OUTPUT);
+    EXPECT_EQ(HeaderRows(), (std::vector<std::string>{
+                                "           T ablc",
+                                "           i  bo ",
+                                "           m   n ",
+                                "           e   g ",
+                                "               e ",
+                                "               r ",
+                            }));
+}
+
+TEST_F(VerilogTestWriter, LabelCharactersPrintAsThemselves) {
+    struct Case {
+        const char* name;
+        std::vector<std::string> labelRows;  // the column of the label in rows 0 to 3
+    };
+    // A backslash or quote is escaped in the string literal and a percent
+    // sign doubled, so that each prints as the one character of the name.
+    const Case cases[] = {
+        {"\\a\\b ", {"\\\\", "a", "\\\\", "b", " "}},
+        {"\\q\"%r ", {"\\\\", "q", "\\\"", "%%", "r", " "}},
+        {"x", {"x", " ", " ", " "}},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.name);
+        Nlw_NlView view;
+        Nlw_NlBuilder b(&view);
+        top_ = b.CreateRoot(b.AddModuleType("top"), "top");
+        b.AddPort(top_, c.name, NLW_DIR_INPUT);
+        const std::vector<std::string> rows = HeaderRows();
+        ASSERT_EQ(rows.size(), c.labelRows.size());
+        for (size_t j = 0; j < rows.size(); ++j) {
+            const std::string time =
+                j < 4 ? std::string(11, ' ') + "Time"[j] + ' ' : std::string(13, ' ');
+            EXPECT_EQ(rows[j], time + c.labelRows[j]) << j;
+        }
+    }
+}
+
+TEST_F(VerilogTestWriter, NamesLongerThanTheGridKeepTheirFirstCharacters) {
+    Root();
+    std::string name(300, 'n');
+    name[255] = 'E';
+    name[256] = 'X';
+    b_.AddPort(top_, name.c_str(), NLW_DIR_INPUT);
+    b_.AddPort(top_, "z", NLW_DIR_INPUT);
+    const std::vector<std::string> rows = HeaderRows();
+    ASSERT_EQ(rows.size(), 256u);
+    EXPECT_EQ(rows[0], "           T nz");
+    EXPECT_EQ(rows[255], std::string(13, ' ') + "E ");
+    // The monitor still names the whole port.
+    EXPECT_NE(MonitorLine().find(name + ",z);"), std::string::npos);
+}
+
+// ---------------------------------------------------------------------------
+// Stimulus
+
+TEST_F(VerilogTestWriter, StimulusDrivesTheGlobalsByConnection) {
+    const std::string head = "    initial begin\n";
+    const std::string tail =
+        "      #1000 $stop;\n"
+        "      // #1000 $finish;\n"
+        "    end\n";
+    struct Global {
+        bool present;
+        int conn, floatVal;
+        bool refPin;
+    };
+    struct Case {
+        const char* what;
+        Global setReset, tristate;
+        std::string body;
+    };
+    const Global none{false, 0, 0, false};
+    const Case cases[] = {
+        {"no globals", none, none, ""},
+        {"set/reset through chipwide",
+         {true, 3, 0, false},
+         none,
+         "        GSR = 1;\n      #100\n        GSR = 0;\n"},
+        {"set/reset floating high",
+         {true, 3, 1, false},
+         none,
+         "        GSR = 0;\n      #100\n        GSR = 1;\n"},
+        {"set/reset with connection 1", {true, 1, 0, true}, none, "      #100\n"},
+        {"set/reset floating -1", {true, 3, -1, false}, none, "      #100\n"},
+        {"set/reset through its port",
+         {true, 0, 1, true},
+         none,
+         "        rst_n = 0;\n      #100\n        rst_n = 1;\n"},
+        {"set/reset connection 2 without a port", {true, 2, 0, false}, none, "      #100\n"},
+        {"tristate through its port", none, {true, 2, 1, true}, "        ts = 1;\n"},
+        {"tristate through chipwide", none, {true, 3, 0, false}, "        GTS = 0;\n"},
+        {"tristate floating -1", none, {true, 3, -1, false}, ""},
+        {"both",
+         {true, 3, 0, false},
+         {true, 3, 1, false},
+         "        GSR = 1;\n        GTS = 1;\n      #100\n        GSR = 0;\n"},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.what);
+        Nlw_NlView view;
+        Nlw_NlBuilder b(&view);
+        top_ = b.CreateRoot(b.AddModuleType("top"), "top");
+        b.ReservePorts(top_, 2);
+        Nlw_NlPin* rst = b.AddPort(top_, "rst_n", NLW_DIR_INPUT);
+        Nlw_NlPin* ts = b.AddPort(top_, "ts", NLW_DIR_INPUT);
+        for (bool setReset : {true, false}) {
+            const Global& g = setReset ? c.setReset : c.tristate;
+            if (!g.present) continue;
+            Nlw_NlSignal* s = b.AddSignal(top_, setReset ? "GSR" : "GTS");
+            if (setReset)
+                b.SetSetReset(s);
+            else
+                b.SetTristate(s);
+            s->AddProperty(
+                Vdm_Property::NewInt(setReset ? "NLW_SETRESET_CONN" : "NLW_TRISTATE_CONN", g.conn));
+            b.GetOrCreateNetwork(s)->AddProperty(Vdm_Property::NewInt("VL_FLOATVAL", g.floatVal));
+            if (g.refPin) {
+                Nlw_NlPin* pin = setReset ? rst : ts;
+                b.ConnectChild(pin, s);
+                b.SetRefPin(s, pin);
+            }
+        }
+        EXPECT_EQ(Stimulus(), head + c.body + tail);
+    }
+}
+
+// ---------------------------------------------------------------------------
+// Driver
+
+TEST_F(VerilogTestWriter, DriverWritesTheFixtureBesideTheNetlist) {
+    TempDir out;
+    ScopedEnv noCache("NLW_NO_NAMECACHE", "1");
+    Root();
+    b_.AddPort(top_, "a", NLW_DIR_INPUT);
+    const std::string netlist = out.Path() + "/top.v";
+    params_.SetOutputFileName(netlist.c_str());
+    params_.SetOutputFileMode(Port::Stream::Replace);
+    params_.SetInputFileType("json");
+    params_.SetWriteTestFile(true);
+    Port_MsgCapture capture;
+    nlw_.WriteDesign();
+
+    const std::string fixture = out.Path() + "/top.tv";
+    const std::vector<std::string> status = capture.Texts(Port_MsgLevel::Status);
+    EXPECT_NE(std::find(status.begin(), status.end(),
+                        "Writing Verilog test file '" + fixture + "' ...\n"),
+              status.end());
+    std::ifstream in(fixture);
+    const std::string text((std::istreambuf_iterator<char>(in)), std::istreambuf_iterator<char>());
+    EXPECT_NE(text.find("    top uut (\n      .a (a)\n    );\n"), std::string::npos) << text;
+}
+
+}  // namespace
