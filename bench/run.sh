@@ -13,8 +13,6 @@ here="$(cd "$(dirname "${BASH_SOURCE[0]}")" && pwd)"
 build="${1:-build}"
 shift || true
 bin="$build/nlw_load_bench"
-data="$here/data"
-sizes=(10000 100000 1000000)
 
 if [ ! -x "$bin" ]; then
     cmake --build "$build" -j2 --target nlw_load_bench >/dev/null
@@ -24,14 +22,8 @@ if [ ! -x /usr/bin/time ]; then
     exit 1
 fi
 
-mkdir -p "$data"
-for n in "${sizes[@]}"; do
-    file="$data/design_$n.json"
-    if [ ! -s "$file" ]; then
-        python3 "$here/gen_design.py" "$n" "$file.tmp" >/dev/null
-        mv "$file.tmp" "$file"
-    fi
-done
+# shellcheck source=designs.sh
+source "$here/designs.sh"
 
 printf '%-10s %9s %10s %10s %12s  %s\n' cells "file MiB" "load s" "wall s" "peak MiB" options
 for n in "${sizes[@]}"; do

@@ -11,20 +11,12 @@ set -euo pipefail
 here="$(cd "$(dirname "${BASH_SOURCE[0]}")" && pwd)"
 build="${1:-build}"
 yosys_too="${2:-}"
-data="$here/data"
 out="$(mktemp -d)"
 trap 'rm -rf "$out"' EXIT
-sizes=(10000 100000 1000000)
 
 [ -x "$build/qdb2ver" ] || cmake --build "$build" -j2 --target qdb2ver >/dev/null
-mkdir -p "$data"
-for n in "${sizes[@]}"; do
-    file="$data/design_$n.json"
-    if [ ! -s "$file" ]; then
-        python3 "$here/gen_design.py" "$n" "$file.tmp" >/dev/null
-        mv "$file.tmp" "$file"
-    fi
-done
+# shellcheck source=designs.sh
+source "$here/designs.sh"
 
 measure() {  # label cells command...: one table row
     local label=$1 cells=$2; shift 2

@@ -9,6 +9,7 @@
 #include "../host/Nlw_Util.h"
 #include "../host/Port.h"
 #include "../host/UT.h"
+#include "Nlw_VerilogWriter.h"
 
 namespace {
 
@@ -94,21 +95,7 @@ void Nlw_VerilogTestWriter::WriteTestHeader() {
     const std::string appVersion = Nlw_Util::CommentText(nlw->GetApplicationVersion());
     const Nlw_Design* design = nlw->GetDesign();
 
-    WriteL(kRule);
-    WriteL("// Copyright (c) Vornix. All rights reserved.");
-    WriteL(kRule);
-
-    // The emblem: a chip with its pins; the labels start in column 19.
-    WriteL("//");
-    WriteL("//       | |");
-    WriteL("//    +------+    Vendor: Vornix");
-    WriteL(vorform("//  --|      |--  Version: %s", appVersion.c_str()));
-    WriteL(vorform("//  --|  VX  |--  Application: %s", appName.c_str()));
-    WriteL(vorform("//  --|      |--  Timestamp: %s",
-                   UT_STR::OrEmpty(Nlw_Util::GetTimeStampString(1))));
-    WriteL("//    +------+");
-    WriteL("//       | |");
-    WriteL("//");
+    Nlw_VerilogWriter::WriteNoticeAndEmblem(this, nullptr);
 
     WriteL(kSeparator);
     WriteL(vorform("// Command: %s", Nlw_Util::CommentText(params->GetCommandLine()).c_str()));

@@ -71,18 +71,7 @@ Nlw_VerilogWriter::Nlw_VerilogWriter(Nlw_NetlistWriter* nlw, const char* fileNam
 
 Nlw_VerilogWriter::Nlw_VerilogWriter(const Nlw_VerilogWriter& other) = default;
 
-Nlw_VerilogWriter& Nlw_VerilogWriter::operator=(const Nlw_VerilogWriter& other) {
-    if (this == &other) return *this;
-    Nlw_Writer::operator=(other);
-    hexStringPropertyTable_ = other.hexStringPropertyTable_;
-    bitStringPropertyTable_ = other.bitStringPropertyTable_;
-    bigEndingTimcellMap_ = other.bigEndingTimcellMap_;
-    recursiveInclusionMap_ = other.recursiveInclusionMap_;
-    bigEndingByType_ = other.bigEndingByType_;
-    inclusionByType_ = other.inclusionByType_;
-    propFilter_ = other.propFilter_;
-    return *this;
-}
+Nlw_VerilogWriter& Nlw_VerilogWriter::operator=(const Nlw_VerilogWriter& other) = default;
 
 Nlw_VerilogWriter::~Nlw_VerilogWriter() {
     // The filter goes with this object; the base must not keep a pointer to it.

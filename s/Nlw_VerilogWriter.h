@@ -56,6 +56,12 @@ public:
     // directory to writer, or reports why it cannot.
     static void WriteLibrarySearch(Nlw_Writer* writer, const char* libraryName);
 
+    // Writes the head every file of this library opens with: a rule, the
+    // notice line, a rule, and the emblem whose labels name the vendor, the
+    // application's version and name, fileName (when not null) and the time
+    // stamp.
+    static void WriteNoticeAndEmblem(Nlw_Writer* writer, const char* fileName);
+
     // Read access for tests.
     const std::multimap<Port::String, Port::String>& GetBigEndingTimcellMap() const {
         return bigEndingTimcellMap_;

@@ -48,34 +48,47 @@ const char* const kStaDisclaimerLast =
 
 }  // namespace
 
+void Nlw_VerilogWriter::WriteNoticeAndEmblem(Nlw_Writer* writer, const char* fileName) {
+    Nlw_NetlistWriter* nlw = writer->GetNlw();
+    writer->WriteL(kRule);
+    writer->WriteL("// Copyright (c) Vornix. All rights reserved.");
+    writer->WriteL(kRule);
+
+    // The emblem: a chip with its pins; the labels start in column 19. A
+    // drawing line without a label carries no trailing blanks.
+    static const char* const kDrawing[] = {"//    +------+    ", "//  --|      |--  ",
+                                           "//  --|  VX  |--  ", "//  --|      |--  ",
+                                           "//    +------+    "};
+    std::string labels[5];
+    size_t count = 0;
+    labels[count++] = "Vendor: Vornix";
+    labels[count++] = "Version: " + Nlw_Util::CommentText(nlw->GetApplicationVersion());
+    labels[count++] = "Application: " + Nlw_Util::CommentText(nlw->GetApplicationName());
+    if (fileName) labels[count++] = "Filename: " + Nlw_Util::CommentText(fileName);
+    labels[count++] = "Timestamp: " + Nlw_Util::CommentText(Nlw_Util::GetTimeStampString(1));
+
+    writer->WriteL("//");
+    writer->WriteL("//       | |");
+    for (size_t i = 0; i < 5; ++i) {
+        std::string line = kDrawing[i];
+        if (labels[i].empty())
+            line.erase(line.find_last_not_of(' ') + 1);
+        else
+            line += labels[i];
+        writer->WriteL(line.c_str());
+    }
+    writer->WriteL("//       | |");
+    writer->WriteL("//");
+}
+
 void Nlw_VerilogWriter::WriteNewHeader(Nlw_NlBlock* block) {
     Nlw_NetlistWriter* nlw = GetNlw();
     Nlw_Params* params = GetParams();
     Nlw_NlView* view = block ? block->GetView() : nlw->GetView();
 
-    WriteL(kRule);
-    WriteL("// Copyright (c) Vornix. All rights reserved.");
-    WriteL(kRule);
-
-    // The emblem: a chip with its pins; the labels start in column 19.
-    WriteL("//");
-    WriteL("//       | |");
-    WriteL("//    +------+    Vendor: Vornix");
-    line_ = "//  --|      |--  Version: ";
-    line_ += UT_STR::OrEmpty(nlw->GetApplicationVersion());
-    WriteL(line_.c_str());
-    line_ = "//  --|  VX  |--  Application: ";
-    line_ += UT_STR::OrEmpty(nlw->GetApplicationName());
-    WriteL(line_.c_str());
-    line_ = "//  --|      |--  Filename: ";
-    line_ += UT_STR::OrEmpty(block ? block->GetFileBaseName() : nullptr);
-    line_ += ".v";
-    WriteL(line_.c_str());
-    line_ = "//    +------+    Timestamp: ";
-    line_ += UT_STR::OrEmpty(Nlw_Util::GetTimeStampString(1));
-    WriteL(line_.c_str());
-    WriteL("//       | |");
-    WriteL("//");
+    const std::string fileName =
+        std::string(UT_STR::OrEmpty(block ? block->GetFileBaseName() : nullptr)) + ".v";
+    WriteNoticeAndEmblem(this, fileName.c_str());
 
     WriteL(kSeparator);
     WriteL(vorform("// Command\t: %s", Nlw_Util::CommentText(params->GetCommandLine()).c_str()));
