@@ -39,7 +39,7 @@ bench: build
 	@bash bench/run_program.sh $(BUILD) --yosys
 
 format:
-	clang-format -i host/*.h host/*.cpp s/*.h s/*.cpp apps/*.cpp apps/common/* tests/unit/*.cpp tests/unit/*/*.cpp 2>/dev/null || true
+	clang-format -i host/*/*.h host/*/*.cpp s/*.h s/*.cpp apps/*.cpp apps/common/* tests/unit/*.cpp tests/unit/*/*.cpp 2>/dev/null || true
 
 clean:
 	rm -rf $(BUILD) $(BUILD_ASAN) out

@@ -12,10 +12,10 @@
 #include <string>
 #include <vector>
 
-#include "Nlw_JsonReader.h"
-#include "Nlw_NetlistWriter.h"
-#include "Nlw_Prep.h"
-#include "Nlw_Util.h"
+#include "framework/Nlw_NetlistWriter.h"
+#include "framework/Nlw_Util.h"
+#include "reader/Nlw_JsonReader.h"
+#include "reader/Nlw_Prep.h"
 
 namespace {
 

@@ -2,10 +2,10 @@
 // design kind. Clock component records are in Nlw_PcsWriter_Clocks.cpp.
 #include "Nlw_PcsWriter.h"
 
-#include "../host/Nlw_Nl.h"
-#include "../host/Nlw_Util.h"
-#include "../host/Port.h"
-#include "../host/UT.h"
+#include "framework/Nlw_Util.h"
+#include "model/Nlw_Nl.h"
+#include "port/Port.h"
+#include "port/UT.h"
 
 namespace {
 

@@ -5,9 +5,9 @@
 
 #include <unordered_set>
 
-#include "../host/Nlw_NetlistWriter.h"
-#include "../host/Nlw_Writer.h"
 #include "Nlw_PcsComp.h"
+#include "framework/Nlw_NetlistWriter.h"
+#include "framework/Nlw_Writer.h"
 
 class Nlw_PcsWriter : public Nlw_Writer {
 public:

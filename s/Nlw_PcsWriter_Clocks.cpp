@@ -6,10 +6,10 @@
 #include <cstdlib>
 #include <cstring>
 
-#include "../host/Nlw_Nl.h"
-#include "../host/Port.h"
-#include "../host/UT.h"
 #include "Nlw_PcsWriter.h"
+#include "model/Nlw_Nl.h"
+#include "port/Port.h"
+#include "port/UT.h"
 
 namespace {
 

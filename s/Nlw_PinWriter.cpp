@@ -7,11 +7,11 @@
 #include <string>
 #include <vector>
 
-#include "../host/Nlw_Nl.h"
-#include "../host/Nlw_Util.h"
-#include "../host/PM.h"
-#include "../host/Port.h"
-#include "../host/UT.h"
+#include "framework/Nlw_Util.h"
+#include "model/Nlw_Nl.h"
+#include "port/PM.h"
+#include "port/Port.h"
+#include "port/UT.h"
 
 namespace {
 

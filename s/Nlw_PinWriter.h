@@ -6,8 +6,8 @@
 #include <string>
 #include <unordered_map>
 
-#include "../host/Nlw_NetlistWriter.h"
-#include "../host/Nlw_Writer.h"
+#include "framework/Nlw_NetlistWriter.h"
+#include "framework/Nlw_Writer.h"
 
 class Nlw_PinWriter : public Nlw_Writer {
 public:

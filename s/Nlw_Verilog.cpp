@@ -4,15 +4,15 @@
 
 #include <string>
 
-#include "../host/Nlw_Nl.h"
-#include "../host/Nlw_Nl_LU.h"
-#include "../host/Port.h"
-#include "../host/UT.h"
 #include "Nlw_PcsWriter.h"
 #include "Nlw_PinWriter.h"
 #include "Nlw_VerilogLU.h"
 #include "Nlw_VerilogTestWriter.h"
 #include "Nlw_VerilogWriter.h"
+#include "framework/Nlw_Nl_LU.h"
+#include "model/Nlw_Nl.h"
+#include "port/Port.h"
+#include "port/UT.h"
 
 namespace {
 

@@ -2,7 +2,7 @@
 // WriteDesign once per design.
 #pragma once
 
-#include "../host/Nlw_NetlistWriter.h"
+#include "framework/Nlw_NetlistWriter.h"
 
 class Nlw_Writer;
 

@@ -4,10 +4,10 @@
 
 #include <string>
 
-#include "../host/Nlw_Nl.h"
-#include "../host/Port.h"
-#include "../host/UT.h"
 #include "Nlw_Verilog.h"
+#include "model/Nlw_Nl.h"
+#include "port/Port.h"
+#include "port/UT.h"
 
 Nlw_VerilogLU::Nlw_VerilogLU(Nlw_Verilog* nlw, Nlw_NlView* view, bool first, bool second,
                              bool third, bool fourth, bool fifth)

@@ -1,7 +1,7 @@
 // Makes the names of a view legal Verilog before it is written.
 #pragma once
 
-#include "../host/Nlw_Nl_LU.h"
+#include "framework/Nlw_Nl_LU.h"
 
 class Nlw_Verilog;
 

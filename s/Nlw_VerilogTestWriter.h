@@ -8,8 +8,8 @@
 #include <string>
 #include <vector>
 
-#include "../host/Nlw_NetlistWriter.h"
-#include "../host/Nlw_Writer.h"
+#include "framework/Nlw_NetlistWriter.h"
+#include "framework/Nlw_Writer.h"
 
 class Nlw_VerilogTestWriter : public Nlw_Writer {
 public:

@@ -5,10 +5,10 @@
 #include <cstring>
 #include <string>
 
-#include "../host/Nlw_Nl.h"
-#include "../host/Nlw_Util.h"
-#include "../host/Port.h"
 #include "Nlw_VerilogTestWriter.h"
+#include "framework/Nlw_Util.h"
+#include "model/Nlw_Nl.h"
+#include "port/Port.h"
 
 namespace {
 

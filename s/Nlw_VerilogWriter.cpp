@@ -4,12 +4,12 @@
 
 #include <cstring>
 
-#include "../host/Nlw_Nl.h"
-#include "../host/Nlw_Params.h"
-#include "../host/Nlw_Util.h"
-#include "../host/PM.h"
-#include "../host/Port.h"
-#include "../host/UT.h"
+#include "framework/Nlw_Params.h"
+#include "framework/Nlw_Util.h"
+#include "model/Nlw_Nl.h"
+#include "port/PM.h"
+#include "port/Port.h"
+#include "port/UT.h"
 
 namespace {
 

@@ -8,8 +8,8 @@
 #include <unordered_set>
 #include <vector>
 
-#include "../host/Nlw_NetlistWriter.h"
-#include "../host/Nlw_Writer.h"
+#include "framework/Nlw_NetlistWriter.h"
+#include "framework/Nlw_Writer.h"
 
 // Case-insensitive hashing and equality of property names.
 struct Nlw_ICaseHash {

@@ -2,11 +2,11 @@
 // that connects every pin by name.
 #include <cstring>
 
-#include "../host/Nlw_Nl.h"
-#include "../host/Nlw_Params.h"
-#include "../host/Port.h"
-#include "../host/UT.h"
 #include "Nlw_VerilogWriter.h"
+#include "framework/Nlw_Params.h"
+#include "model/Nlw_Nl.h"
+#include "port/Port.h"
+#include "port/UT.h"
 
 namespace {
 

@@ -4,12 +4,12 @@
 #include <string>
 #include <unordered_set>
 
-#include "../host/Nlw_Nl.h"
-#include "../host/Nlw_Params.h"
-#include "../host/PM.h"
-#include "../host/Port.h"
-#include "../host/UT.h"
 #include "Nlw_VerilogWriter.h"
+#include "framework/Nlw_Params.h"
+#include "model/Nlw_Nl.h"
+#include "port/PM.h"
+#include "port/Port.h"
+#include "port/UT.h"
 
 void Nlw_VerilogWriter::InitBigEndingTimcellMap() {
     InitNameMap(bigEndingTimcellMap_, "BigEndingTimcell", false);

@@ -3,12 +3,12 @@
 // hexadecimal or a bit-string literal.
 #include <cstring>
 
-#include "../host/Nlw_Nl.h"
-#include "../host/Nlw_Params.h"
-#include "../host/Nlw_Util.h"
-#include "../host/Port.h"
-#include "../host/UT.h"
 #include "Nlw_VerilogWriter.h"
+#include "framework/Nlw_Params.h"
+#include "framework/Nlw_Util.h"
+#include "model/Nlw_Nl.h"
+#include "port/Port.h"
+#include "port/UT.h"
 
 namespace {
 

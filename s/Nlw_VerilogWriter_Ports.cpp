@@ -1,10 +1,10 @@
 // A module's ports: the name list of the module header and the direction
 // declarations that open the module body. Scalar ports always come before
 // bus ports.
-#include "../host/Nlw_Nl.h"
-#include "../host/Nlw_Params.h"
-#include "../host/Port.h"
 #include "Nlw_VerilogWriter.h"
+#include "framework/Nlw_Params.h"
+#include "model/Nlw_Nl.h"
+#include "port/Port.h"
 
 namespace {
 

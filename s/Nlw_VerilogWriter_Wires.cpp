@@ -2,9 +2,9 @@
 // joins each port to its net where the two names differ.
 #include <cstring>
 
-#include "../host/Nlw_Nl.h"
-#include "../host/Nlw_Params.h"
 #include "Nlw_VerilogWriter.h"
+#include "framework/Nlw_Params.h"
+#include "model/Nlw_Nl.h"
 
 void Nlw_VerilogWriter::WriteWireDeclarations(Nlw_NlBlock* block) {
     Nlw_NetlistWriter* nlw = GetNlw();

@@ -1,10 +1,10 @@
 // The stock netlist head, the run-parameter block and the closing notices.
-#include "../host/Nlw_Nl.h"
-#include "../host/Nlw_Util.h"
-#include "../host/Nlw_Writer.h"
-#include "../host/Port.h"
 #include "Nlw_Verilog.h"
 #include "Nlw_VerilogWriter.h"
+#include "framework/Nlw_Util.h"
+#include "framework/Nlw_Writer.h"
+#include "model/Nlw_Nl.h"
+#include "port/Port.h"
 
 namespace {
 

@@ -4,10 +4,10 @@
 #include <string>
 #include <vector>
 
-#include "../host/Nlw_Nl.h"
-#include "../host/Port.h"
-#include "../host/Vdm_Property.h"
 #include "Nlw_Verilog.h"
+#include "model/Nlw_Nl.h"
+#include "model/Vdm_Property.h"
+#include "port/Port.h"
 
 namespace {
 

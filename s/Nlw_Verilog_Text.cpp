@@ -2,10 +2,10 @@
 #include <charconv>
 #include <string>
 
-#include "../host/Nlw_Nl.h"
-#include "../host/Port.h"
-#include "../host/UT.h"
 #include "Nlw_Verilog.h"
+#include "model/Nlw_Nl.h"
+#include "port/Port.h"
+#include "port/UT.h"
 
 namespace {
 

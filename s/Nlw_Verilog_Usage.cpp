@@ -1,7 +1,7 @@
 // Usage texts of the two host programs.
-#include "../host/Port.h"
-#include "../host/UT.h"
 #include "Nlw_Verilog.h"
+#include "port/Port.h"
+#include "port/UT.h"
 
 // The missing blanks before some options belong to the texts.
 const char* const Nlw_Verilog::kQdb2verSynopsis =

@@ -7,12 +7,12 @@
 #include <string>
 #include <vector>
 
-#include "Nlw_JsonReader.h"
-#include "Nlw_Prep.h"
-#include "Nlw_Util.h"
 #include "Nlw_Verilog.h"
-#include "Port.h"
-#include "UT.h"
+#include "framework/Nlw_Util.h"
+#include "port/Port.h"
+#include "port/UT.h"
+#include "reader/Nlw_JsonReader.h"
+#include "reader/Nlw_Prep.h"
 
 namespace {
 
@@ -83,12 +83,16 @@ int Nlw_RunProgram(Nlw_Program program, int argc, const char* const* argv) {
     for (int i = 1; i < argc; ++i) args.emplace_back(argv[i]);
     Nlw_CommandLine cl = Nlw_ParseCommandLine(program, args);
 
+    if (cl.version && cl.error.empty()) {
+        std::printf("%s (nlw-verilog) %s\n", ProgramName(program), NLW_VERSION);
+        return 0;
+    }
     if (cl.help) {
         // "tessel -h <netlist_type>" asks for the options of that netlist
         // type: the option list; without a known type tessel prints its
         // overview (which ends the program).
-        static const char* const kNetlistTypes[] = {"equivalence", "ecn", "simulation",
-                                                    "sim", "static", "sta"};
+        static const char* const kNetlistTypes[] = {"equivalence", "ecn",    "simulation",
+                                                    "sim",         "static", "sta"};
         bool known = false;
         for (const char* type : kNetlistTypes)
             if (UT_STR::ICompare(cl.helpTopic.c_str(), type) == 0) known = true;
@@ -147,7 +151,8 @@ int Nlw_RunProgram(Nlw_Program program, int argc, const char* const* argv) {
     writer.WriteDesign();
     clock.Trace("Writing");
 
-    int errors = messages.GetCount(Port_MsgLevel::Error) + messages.GetCount(Port_MsgLevel::Internal);
+    int errors =
+        messages.GetCount(Port_MsgLevel::Error) + messages.GetCount(Port_MsgLevel::Internal);
     messages.CloseLog();
     return errors > 0 ? 1 : 0;
 }

@@ -4,7 +4,7 @@
 #include <cstring>
 #include <functional>
 
-#include "UT.h"
+#include "port/UT.h"
 
 namespace {
 
@@ -41,18 +41,24 @@ bool ParseBool(const std::string& v, bool& out) {
     return false;
 }
 
-#define FLAG(expr) [](Nlw_CommandLine& cl, const std::string&) { expr; return std::string(); }
-#define TEXT(setter) \
-    [](Nlw_CommandLine& cl, const std::string& v) { cl.params.setter(v.c_str()); return std::string(); }
-#define BOOL(setter)                                                        \
-    [](Nlw_CommandLine& cl, const std::string& v) {                         \
-        bool b;                                                             \
-        if (!ParseBool(v, b)) return std::string("expects true or false"); \
-        cl.params.setter(b);                                                \
-        return std::string();                                               \
+#define FLAG(expr)                                \
+    [](Nlw_CommandLine& cl, const std::string&) { \
+        expr;                                     \
+        return std::string();                     \
     }
-#define IGNORE(name) \
-    [](Nlw_CommandLine& cl, const std::string& v) { return Ignore(cl, v, name); }
+#define TEXT(setter)                                \
+    [](Nlw_CommandLine& cl, const std::string& v) { \
+        cl.params.setter(v.c_str());                \
+        return std::string();                       \
+    }
+#define BOOL(setter)                                                       \
+    [](Nlw_CommandLine& cl, const std::string& v) {                        \
+        bool b;                                                            \
+        if (!ParseBool(v, b)) return std::string("expects true or false"); \
+        cl.params.setter(b);                                               \
+        return std::string();                                              \
+    }
+#define IGNORE(name) [](Nlw_CommandLine& cl, const std::string& v) { return Ignore(cl, v, name); }
 
 // Options both programs share, under the names both spell alike.
 std::vector<Option> CommonOptions() {
@@ -119,7 +125,7 @@ std::vector<Option> TesselOptions() {
         {"-ofmt", Arg::Value,
          [](Nlw_CommandLine&, const std::string& v) {
              return UT_STR::ICompare(v.c_str(), "verilog") == 0 ? std::string()
-                                                               : std::string("expects verilog");
+                                                                : std::string("expects verilog");
          }},
         {"-bx", Arg::Value, IGNORE("-bx")},
         {"-bd", Arg::Value, IGNORE("-bd")},
@@ -166,7 +172,9 @@ std::vector<Option> TesselOptions() {
     return o;
 }
 
-bool LooksLikeOption(const std::string& w) { return w.size() > 1 && w[0] == '-'; }
+bool LooksLikeOption(const std::string& w) {
+    return w.size() > 1 && w[0] == '-';
+}
 
 // The extension of the file name part, in lower case; "" when none.
 std::string FileExtension(const std::string& path) {
@@ -190,6 +198,10 @@ Nlw_CommandLine Nlw_ParseCommandLine(Nlw_Program program, const std::vector<std:
         if (w == "-h" || w == "-help" || w == "--help") {
             cl.help = true;
             if (i + 1 < args.size() && !LooksLikeOption(args[i + 1])) cl.helpTopic = args[++i];
+            continue;
+        }
+        if (w == "--version" || w == "-version") {
+            cl.version = true;
             continue;
         }
         if (!LooksLikeOption(w)) {
@@ -231,7 +243,7 @@ Nlw_CommandLine Nlw_ParseCommandLine(Nlw_Program program, const std::vector<std:
         std::string problem = opt->apply(cl, value);
         if (!problem.empty()) cl.error = "Option '" + w + "' " + problem + ", not '" + value + "'.";
     }
-    if (!cl.error.empty() || cl.help) return cl;
+    if (!cl.error.empty() || cl.help || cl.version) return cl;
     if (files.empty()) {
         cl.error = "No input file name given.";
         return cl;

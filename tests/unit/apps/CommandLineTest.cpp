@@ -12,9 +12,9 @@ Nlw_CommandLine Parse(Nlw_Program p, std::vector<std::string> args) {
 }
 
 TEST(CommandLine, Qdb2verSwitchesReachTheParameters) {
-    Nlw_CommandLine cl = Parse(Nlw_Program::Qdb2ver,
-                               {"-10ps", "-aka", "-cd", "-fn", "-ism", "-ne", "-pf", "-tf", "-ul",
-                                "-w", "-shm", "in.json"});
+    Nlw_CommandLine cl =
+        Parse(Nlw_Program::Qdb2ver, {"-10ps", "-aka", "-cd", "-fn", "-ism", "-ne", "-pf", "-tf",
+                                     "-ul", "-w", "-shm", "in.json"});
     ASSERT_EQ(cl.error, "");
     const Nlw_Params& p = cl.params;
     EXPECT_FALSE(p.GetWritePsTimePrecision());
@@ -57,9 +57,9 @@ TEST(CommandLine, OutputNameGetsVerilogExtension) {
 }
 
 TEST(CommandLine, ValuesAndOptionalValues) {
-    Nlw_CommandLine cl = Parse(Nlw_Program::Qdb2ver, {"-ti", "u0", "-tm", "chip", "-log", "l.txt",
-                                                      "-sdf_path", "sdf", "-insert_chipwide",
-                                                      "FALSE", "a.json"});
+    Nlw_CommandLine cl =
+        Parse(Nlw_Program::Qdb2ver, {"-ti", "u0", "-tm", "chip", "-log", "l.txt", "-sdf_path",
+                                     "sdf", "-insert_chipwide", "FALSE", "a.json"});
     ASSERT_EQ(cl.error, "");
     EXPECT_STREQ(cl.params.GetRootInstanceName(), "u0");
     EXPECT_STREQ(cl.params.GetTopModuleName(), "chip");
@@ -91,8 +91,8 @@ TEST(CommandLine, TesselModesAndFiles) {
 }
 
 TEST(CommandLine, OptionsWithoutDataAreAcceptedAndListed) {
-    Nlw_CommandLine cl =
-        Parse(Nlw_Program::Tessel, {"-gp", "GSR", "-s", "5", "-qcf", "c.qcf", "--cleanup", "a.json"});
+    Nlw_CommandLine cl = Parse(Nlw_Program::Tessel,
+                               {"-gp", "GSR", "-s", "5", "-qcf", "c.qcf", "--cleanup", "a.json"});
     ASSERT_EQ(cl.error, "");
     EXPECT_EQ(cl.ignored, (std::vector<std::string>{"-gp", "-s", "-qcf", "--cleanup"}));
 }
@@ -103,14 +103,14 @@ TEST(CommandLine, UnusableCommandLines) {
         std::vector<std::string> args;
     };
     const Case cases[] = {
-        {Nlw_Program::Qdb2ver, {}},                              // no input file
-        {Nlw_Program::Qdb2ver, {"-bogus", "a.json"}},            // unknown option
-        {Nlw_Program::Qdb2ver, {"a.json", "-ti"}},               // missing value
+        {Nlw_Program::Qdb2ver, {}},                                  // no input file
+        {Nlw_Program::Qdb2ver, {"-bogus", "a.json"}},                // unknown option
+        {Nlw_Program::Qdb2ver, {"a.json", "-ti"}},                   // missing value
         {Nlw_Program::Qdb2ver, {"-insert_chipwide", "maybe", "a"}},  // bad value
-        {Nlw_Program::Qdb2ver, {"-sim", "a.json"}},              // a tessel option
+        {Nlw_Program::Qdb2ver, {"-sim", "a.json"}},                  // a tessel option
         {Nlw_Program::Tessel, {"-ofmt", "vhdl", "a.json"}},
         {Nlw_Program::Tessel, {"-intstyle", "loud", "a.json"}},
-        {Nlw_Program::Tessel, {"a.json", "b.v", "c"}},           // one word too many
+        {Nlw_Program::Tessel, {"a.json", "b.v", "c"}},  // one word too many
     };
     for (const Case& c : cases) {
         Nlw_CommandLine cl = Parse(c.program, c.args);

@@ -2,8 +2,8 @@
 // closing notices, observed through the files and messages a run leaves.
 #include <algorithm>
 
-#include "Nlw_Nl_LU.h"
 #include "VerilogWriterTest.h"
+#include "framework/Nlw_Nl_LU.h"
 
 namespace {
 

@@ -1,7 +1,7 @@
 // The stock netlist head, the run-parameter block, the closing notices and
 // the output file names.
-#include "Nlw_Writer.h"
 #include "VerilogWriterTest.h"
+#include "framework/Nlw_Writer.h"
 
 // Reaches the writer object's private parts.
 struct Nlw_VerilogTestPeer {

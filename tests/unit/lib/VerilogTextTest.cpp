@@ -4,8 +4,8 @@
 #include <string>
 #include <vector>
 
-#include "Nlw_NlBuilder.h"
 #include "Nlw_Verilog.h"
+#include "model/Nlw_NlBuilder.h"
 
 namespace {
 

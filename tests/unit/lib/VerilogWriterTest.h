@@ -11,12 +11,12 @@
 #include <memory>
 #include <string>
 
-#include "Nlw_NlBuilder.h"
-#include "Nlw_Params.h"
-#include "Nlw_Util.h"
 #include "Nlw_Verilog.h"
 #include "Nlw_VerilogWriter.h"
-#include "Port.h"
+#include "framework/Nlw_Params.h"
+#include "framework/Nlw_Util.h"
+#include "model/Nlw_NlBuilder.h"
+#include "port/Port.h"
 
 namespace vwtest {
 

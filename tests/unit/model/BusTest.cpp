@@ -4,7 +4,7 @@
 #include <string>
 #include <vector>
 
-#include "Nlw_NlBuilder.h"
+#include "model/Nlw_NlBuilder.h"
 
 namespace {
 

@@ -5,8 +5,8 @@
 #include <string>
 #include <vector>
 
-#include "Nlw_NlBuilder.h"
-#include "Port.h"
+#include "model/Nlw_NlBuilder.h"
+#include "port/Port.h"
 
 namespace {
 

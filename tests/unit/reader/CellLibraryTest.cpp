@@ -1,7 +1,7 @@
 // The installation's cell library file.
-#include "Nlw_CellLibrary.h"
-#include "Nlw_Nl.h"
 #include "ReaderTestSupport.h"
+#include "model/Nlw_Nl.h"
+#include "reader/Nlw_CellLibrary.h"
 
 using namespace readertest;
 

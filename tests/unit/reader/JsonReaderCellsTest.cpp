@@ -2,8 +2,8 @@
 // pins, pads, global signals and the device.
 #include <iterator>
 
-#include "Nlw_Util.h"
 #include "ReaderTestSupport.h"
+#include "framework/Nlw_Util.h"
 
 using namespace readertest;
 

@@ -1,6 +1,6 @@
 // Nets, ports, buses and constants of a module read from netlist JSON.
-#include "Nlw_Util.h"
 #include "ReaderTestSupport.h"
+#include "framework/Nlw_Util.h"
 
 using namespace readertest;
 

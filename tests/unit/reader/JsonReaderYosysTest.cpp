@@ -1,8 +1,8 @@
 // Netlists that yosys writes from small designs, read back.
 #include <set>
 
-#include "Nlw_Util.h"
 #include "ReaderTestSupport.h"
+#include "framework/Nlw_Util.h"
 
 using namespace readertest;
 

@@ -3,10 +3,10 @@
 #include <cmath>
 #include <memory>
 
-#include "Nlw_NetlistWriter.h"
-#include "Nlw_Prep.h"
-#include "Nlw_Util.h"
 #include "ReaderTestSupport.h"
+#include "framework/Nlw_NetlistWriter.h"
+#include "framework/Nlw_Util.h"
+#include "reader/Nlw_Prep.h"
 
 using namespace readertest;
 

@@ -13,10 +13,10 @@
 #include <string>
 #include <vector>
 
-#include "Nlw_JsonReader.h"
-#include "Nlw_Nl.h"
-#include "Port.h"
 #include "TestFiles.h"
+#include "model/Nlw_Nl.h"
+#include "port/Port.h"
+#include "reader/Nlw_JsonReader.h"
 
 namespace readertest {
 

@@ -1,0 +1,93 @@
+// The parsed command line of a run.
+#pragma once
+
+#include <string>
+
+#include "port/Port.h"
+
+class Nlw_Params {
+public:
+    // A text parameter that was not given reads as null.
+#define NLW_TEXT_PARAM(Name)                             \
+    const char* Get##Name() const {                      \
+        return has##Name##_ ? Name##_.c_str() : nullptr; \
+    }                                                    \
+    void Set##Name(const char* v) {                      \
+        has##Name##_ = v != nullptr;                     \
+        Name##_ = v ? v : "";                            \
+    }                                                    \
+                                                         \
+private:                                                 \
+    std::string Name##_;                                 \
+    bool has##Name##_ = false;                           \
+                                                         \
+public:
+#define NLW_FLAG_PARAM(Name, Default) \
+    bool Get##Name() const {          \
+        return Name##_;               \
+    }                                 \
+    void Set##Name(bool v) {          \
+        Name##_ = v;                  \
+    }                                 \
+                                      \
+private:                              \
+    bool Name##_ = Default;           \
+                                      \
+public:
+
+    // Files.
+    NLW_TEXT_PARAM(InputFileName)
+    NLW_TEXT_PARAM(InputFileType)  // "qdb", "qda", "json"
+    NLW_TEXT_PARAM(OutputFileName)
+    NLW_TEXT_PARAM(CommandLine)
+    NLW_TEXT_PARAM(Vornix)  // the installation roots as given
+    NLW_TEXT_PARAM(SdfPath)
+    NLW_TEXT_PARAM(QdmFileName)
+    NLW_TEXT_PARAM(EcnTool)
+    NLW_TEXT_PARAM(RootInstanceName)    // -ti
+    NLW_TEXT_PARAM(TopModuleName)       // -tm
+    NLW_TEXT_PARAM(GlobalSetResetPort)  // -gp
+    NLW_TEXT_PARAM(GlobalTristatePort)  // -tp
+    NLW_TEXT_PARAM(LogFileName)
+    NLW_TEXT_PARAM(OutputDir)  // -dir
+    NLW_TEXT_PARAM(IntStyle)
+
+    // Modes.
+    NLW_FLAG_PARAM(SimMode, true)
+    NLW_FLAG_PARAM(EcnMode, false)
+    NLW_FLAG_PARAM(StaMode, false)
+    NLW_FLAG_PARAM(FuncellMode, false)
+    NLW_FLAG_PARAM(MHFMode, false)
+
+    // Files to write.
+    NLW_FLAG_PARAM(WriteSdfFile, false)
+    NLW_FLAG_PARAM(WritePinFile, false)
+    NLW_FLAG_PARAM(WriteTestFile, false)
+    NLW_FLAG_PARAM(WriteInstantiatedTimcells, false)
+
+    // Writing options.
+    NLW_FLAG_PARAM(WriteEscapedNames, true)
+    NLW_FLAG_PARAM(WritePsTimePrecision, true)
+    NLW_FLAG_PARAM(WriteUseLib, false)
+    NLW_FLAG_PARAM(WriteCellDefine, false)
+    NLW_FLAG_PARAM(WriteAka, false)
+    NLW_FLAG_PARAM(Insert_chipwide, true)
+    NLW_FLAG_PARAM(SdfAnnotate, true)
+    NLW_FLAG_PARAM(WriteShm, false)
+    NLW_FLAG_PARAM(WriteVcd, false)
+    NLW_FLAG_PARAM(Flatten, false)
+    NLW_FLAG_PARAM(RetainHierarchy, true)
+
+#undef NLW_TEXT_PARAM
+#undef NLW_FLAG_PARAM
+
+    Port::Stream::Access GetOutputFileMode() const {
+        return mode_;
+    }
+    void SetOutputFileMode(Port::Stream::Access m) {
+        mode_ = m;
+    }
+
+private:
+    Port::Stream::Access mode_ = Port::Stream::Create;
+};

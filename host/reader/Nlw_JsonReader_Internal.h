@@ -1,0 +1,352 @@
+// The design reader's working data: each module of the netlist JSON digested
+// into compact tables (ports, named nets, cells, connections, parameters)
+// that the unfolding and flattening builders turn into model objects.
+//
+// The tables keep their own copies of the texts they need (a text pool), so
+// the parsed document, which is several times the size of the file, can be
+// released before the model is built.
+#pragma once
+
+#include <simdjson.h>
+
+#include <cstdint>
+#include <map>
+#include <memory>
+#include <string>
+#include <string_view>
+#include <unordered_map>
+#include <vector>
+
+#include "model/Nlw_NlBuilder.h"
+#include "reader/Nlw_CellLibrary.h"
+#include "reader/Nlw_JsonReader.h"
+
+namespace nlw_json {
+
+// A fault of the input. Thrown inside the reader and reported once by Load.
+struct ReadError {
+    std::string text;
+};
+[[noreturn]] void Fail(std::string text);
+
+// A NUL-terminated text of the pool (or a literal); never null.
+using Text = const char*;
+
+// Stable copies of texts, allocated in large chunks and released together.
+class TextPool {
+public:
+    Text Keep(std::string_view s);
+
+private:
+    std::vector<std::unique_ptr<char[]>> chunks_;
+    char* cur_ = nullptr;
+    size_t left_ = 0;
+};
+
+// Net references: a local net number (>= 0) or a constant bit.
+enum : int32_t { kConst0 = -1, kConst1 = -2, kConstX = -3, kConstZ = -4 };
+// "1'b0", "1'b1", "1'bx" or "1'bz".
+const char* ConstName(int32_t ref);
+
+constexpr uint32_t kNone = 0xFFFFFFFFu;
+
+// A parameter or attribute value as the file gives it. The text of a value
+// just read may lie in the document; a stored one lies in the pool.
+enum class ValueKind : uint8_t { Bits, String, Int, Float, Bool };
+struct Value {
+    ValueKind kind = ValueKind::String;
+    std::string_view text;  // Bits: 0 1 x z, most significant first; String
+    int64_t i = 0;          // Int, Bool
+    double d = 0;           // Float
+};
+struct Param {
+    Text name = "";
+    ValueKind kind = ValueKind::String;
+    Text text = "";
+    int64_t i = 0;
+    double d = 0;
+};
+
+struct Port {
+    Text name = "";
+    int dir = NLW_DIR_UNTYPED;
+    uint32_t width = 0;
+    int32_t msb = 0, lsb = 0;  // bus range; a port of one bit is scalar
+    uint32_t bitFirst = 0;     // its bits in Module::refs, least significant first
+    uint32_t pinPos = 0;       // position of its first pin on a block
+    Text pinName = "";         // "PINNAME" or "LOC" of its net, for pads
+    bool IsBus() const { return width > 1; }
+    // Pin position of bit i: bus members are stored from msb to lsb.
+    uint32_t BitPos(uint32_t i) const { return pinPos + (IsBus() ? width - 1 - i : 0); }
+};
+
+// One connection of a cell: the pin (library type pin or module port) and
+// its bits in Module::refs.
+struct Conn {
+    uint32_t slot = 0;
+    uint32_t bitFirst = 0;
+    uint32_t width = 0;
+};
+
+// What few cells carry: the attributes the writers read.
+struct CellExtra {
+    Text aka = "";       // from "hdlname", joined with "/"
+    Text pinName = "";   // "PINNAME" (or "LOC" for a pad)
+    Text typeAttr = "";  // "TYPE"
+};
+
+struct Cell {
+    Text name = "";
+    uint32_t type = 0;  // LibVariant, or module when macro
+    uint32_t connFirst = 0, connCount = 0;
+    uint32_t paramFirst = 0, paramCount = 0;
+    uint32_t extra = kNone;  // in Module::extras
+    bool macro = false;
+};
+
+// A bus of named nets (a multi-bit port or net name that names some nets).
+struct NetBus {
+    Text name = "";
+    int32_t msb = 0, lsb = 0;
+    Text aka = "";
+};
+
+// The name a net of a module gets.
+struct NetName {
+    int32_t bus = -1;   // NetBus index, or -1 for a scalar
+    int32_t index = 0;  // bus index
+    Text name = "";     // scalar name
+    Text aka = "";      // scalar also-known-as name
+    uint32_t rank = 0;  // lower is preferred: class, then file order
+};
+
+// A net of the top module marked as the global set/reset or tristate.
+struct GlobalNet {
+    bool setReset = false;
+    int32_t ref = 0;
+    int32_t conn = 3;
+    int32_t floatVal = 0;
+};
+
+struct Module {
+    std::string_view name;  // in the document, while it lives
+    Text nameText = "";
+    simdjson::dom::object json;
+    bool blackbox = false;
+    bool topAttr = false;
+    bool reachable = false;
+    Nlw_NlType* nlType = nullptr;
+    Text part = "";
+    std::vector<Port> ports;
+    std::unordered_map<std::string_view, uint32_t> portIndex;
+    uint32_t numPins = 0;  // pins of an instance: the ports' bits
+    // Modules this one instantiates, in cell order (repeats kept out).
+    std::vector<uint32_t> children;
+
+    std::vector<int32_t> refs;
+    std::vector<Cell> cells;
+    std::vector<CellExtra> extras;
+    std::vector<Conn> conns;
+    std::vector<Param> params;
+    uint32_t numNets = 0;
+    std::vector<NetName> nets;
+    std::vector<NetBus> buses;
+    std::vector<GlobalNet> globals;
+    // Some pad cell at or below this module needs its port's pin name.
+    bool padsBelow = false;
+    bool ownPads = false;
+
+    const CellExtra& ExtraOf(const Cell& c) const {
+        static const CellExtra none;
+        return c.extra == kNone ? none : extras[c.extra];
+    }
+};
+
+// A library cell type: its pins are the union of what its definitions and
+// its instances' connections give.
+struct LibType {
+    Text name = "";
+    const Nlw_CellDef* def = nullptr;
+    int32_t blackbox = -1;  // module that describes it
+    struct Pin {
+        Text name = "";
+        int dir = NLW_DIR_UNTYPED;
+        // A pin a definition gives has its range; the others take the width
+        // each instance connects (see LibVariant).
+        bool fixedRange = false;
+        uint32_t width = 1;
+        int32_t msb = 0, lsb = 0;
+        bool bus = false;
+        bool pad = false;
+    };
+    std::vector<Pin> pins;
+    std::unordered_map<std::string_view, uint32_t> pinIndex;
+    int32_t padPin = -1;
+    bool pad = false;
+    bool flexible = false;  // some pin takes its width from the instances
+    // The layouts met so far: widths per pin (trailing scalars dropped) to
+    // the LibVariant.
+    std::map<std::vector<uint32_t>, uint32_t> variants;
+};
+
+// One pin layout of a library type. Types that are not in the cell library
+// are often parametric (a lookup table of 2 inputs next to one of 4): each
+// width of each open pin the instances connect makes a model type of its
+// own, so that every instance's pins are exactly as wide as its connections.
+struct LibVariant {
+    uint32_t base = 0;  // the LibType
+    std::vector<uint32_t> signature;
+    Nlw_NlType* type = nullptr;
+    // Per pin of the base type: position of its first pin on an instance,
+    // width, and whether it is a bus (whose members run from msb to lsb).
+    std::vector<uint32_t> pos, width;
+    std::vector<uint8_t> bus;
+    uint32_t BitPos(uint32_t pin, uint32_t i) const {
+        return pos[pin] + (bus[pin] ? width[pin] - 1 - i : 0);
+    }
+};
+
+// Where in the document a fault is; the text is made only for a message.
+struct Where {
+    std::string_view module, cell, section, key;
+    std::string Text() const;
+};
+
+// A named net of a module as the file lists it.
+struct NetEntry {
+    nlw_json::Text name = "";
+    bool hidden = false;
+    uint32_t bitFirst = 0, width = 0;  // in Module::refs
+    int32_t msb = 0, lsb = 0;
+    nlw_json::Text aka = "";
+    int32_t port = -1;  // the port of the same name
+};
+
+// The work space of naming nets, kept from module to module: a design may
+// hold very many small modules.
+struct NameCandidate {
+    Text name;
+    uint32_t bitFirst, width;
+    int32_t msb, lsb;
+    Text aka;
+    uint32_t rank;
+};
+struct NameScratch {
+    std::vector<NetEntry> entries;
+    std::vector<NameCandidate> cands;
+    std::vector<Text> portAka;
+    std::vector<uint32_t> rank, winBit;
+    std::vector<int32_t> winner, busOf, bitMap;
+};
+
+struct Design {
+    std::string fileName;
+    Nlw_ReadOptions options;
+    simdjson::dom::parser parser;
+    simdjson::dom::element root;
+    TextPool pool;
+    std::vector<Module> modules;
+    std::unordered_map<std::string_view, uint32_t> moduleIndex;
+    std::vector<LibType> types;
+    std::vector<LibVariant> variants;
+    std::unordered_map<std::string_view, uint32_t> typeIndex;
+    std::vector<uint32_t> signature;  // work space
+    Nlw_CellLibrary cellLib;
+    uint32_t top = 0;
+    // Modules reachable from the top, each after every module it instantiates.
+    std::vector<uint32_t> bottomUp;
+    NameScratch scratch;
+
+    const char* File() const { return fileName.c_str(); }
+    // Lets the document go once every module is digested; the names and
+    // indexes that point into it go with it.
+    void ReleaseDocument();
+};
+
+// Reading the document (Nlw_JsonReader_Modules.cpp, Nlw_JsonReader_Cells.cpp).
+// The module list with every module's attributes, ports and children.
+void ReadModuleList(Design& d);
+// Named nets and cells of a module reached from the top.
+void DigestModule(Design& d, Module& m);
+void ReadCells(Design& d, Module& m, simdjson::dom::object cells);
+// Appends the bits of a bit array to m.refs (raw bit numbers, to be mapped
+// to local nets) and returns how many there were.
+uint32_t ReadBits(simdjson::dom::element e, Module& m, const Where& where);
+Value ReadValue(simdjson::dom::element e, TextPool& pool, const Where& where);
+// A value as text: strings as they stand, bits and numbers in decimal.
+std::string_view ValueText(const Value& v, TextPool& pool);
+// True for a value that reads as a non-zero number or a non-empty string
+// other than "0".
+bool ValueIsTrue(const Value& v);
+bool ValueToInt(const Value& v, int64_t& out);
+// "a b c" as "a/b/c", in the pool.
+Text JoinPath(std::string_view hdlname, TextPool& pool);
+
+// Naming the nets of a module (Nlw_JsonReader_Nets.cpp).
+void NameNets(Module& m, NameScratch& s, TextPool& pool);
+
+// Hierarchy (Nlw_JsonReader_Hierarchy.cpp): cycles, top, reachable order,
+// and the digest of every module the top reaches.
+void ResolveHierarchy(Design& d);
+
+// Library types (Nlw_JsonReader_Types.cpp).
+uint32_t FindOrAddLibType(Design& d, std::string_view name);
+// The layout of a leaf cell whose connections are read.
+uint32_t FindOrAddVariant(Design& d, uint32_t type, const Module& m, const Cell& c);
+void CreateLibTypes(Design& d, Nlw_NlBuilder& b);
+
+// Model building shared by both builders (Nlw_JsonReader_Build.cpp).
+// The block's properties: the cell's parameters in file order, then the
+// attributes the writers read ("PINNAME", "TYPE"), then, when there were
+// such, the parameter count (Nlw_JsonReader::GetParameterCount).
+void AddBlockProperties(const Module& m, const Cell& c, const LibType* lt, Text padPinName,
+                        Nlw_NlBlock* block);
+// The library types, the module type of the top and the view's device.
+Nlw_NlBlock* CreateTop(Design& d, Nlw_NlBuilder& b);
+Nlw_NlType* ModuleType(Module& m, Nlw_NlBuilder& b);
+// Marks the top module's global nets; signals[ref] is the top's signal of
+// a net (null for a net tied to a constant).
+void ApplyGlobals(const Module& top, Nlw_NlBuilder& b, Nlw_NlBlock* root,
+                  const std::vector<Nlw_NlSignal*>& signals);
+// The invisible global signal that stands for a constant port bit.
+Nlw_NlSignal* ConstSignal(Nlw_NlBuilder& b, Nlw_NlBlock* block, int32_t ref,
+                          Nlw_NlSignal* (&cache)[4]);
+void AddPorts(Nlw_NlBuilder& b, const Module& m, Nlw_NlBlock* block);
+// The local net on the pad pin of a pad cell, or kConstX when none.
+int32_t PadPinRef(const Module& m, const Cell& c, const LibType& lt);
+
+// A leaf for a library cell. net(ref, ref) gives the signal of a local net,
+// or null after turning ref into the constant the net is tied to.
+template <typename NetFn>
+Nlw_NlBlock* CreateLeafCell(Nlw_NlBuilder& b, const Module& m, const Cell& c, const LibVariant& v,
+                            const LibType& lt, Nlw_NlBlock* parent, const char* name,
+                            Text padPinName, NetFn net) {
+    Nlw_NlBlock* leaf = b.CreateLeaf(parent, v.type, name);
+    const CellExtra& x = m.ExtraOf(c);
+    if (*x.aka) leaf->SetAka(x.aka);
+    for (uint32_t k = 0; k < c.connCount; ++k) {
+        const Conn& cn = m.conns[c.connFirst + k];
+        for (uint32_t i = 0; i < cn.width; ++i) {
+            int32_t ref = m.refs[cn.bitFirst + i];
+            Nlw_NlSignal* s = ref >= 0 ? net(ref, ref) : nullptr;
+            Nlw_NlPin* pin = leaf->GetPin(v.BitPos(cn.slot, i));
+            // "x" and "z" bits stay unconnected.
+            if (s)
+                b.Connect(pin, s);
+            else if (ref == kConst0 || ref == kConst1)
+                b.SetTieOff(pin, ref == kConst1 ? 1 : 0);
+        }
+    }
+    AddBlockProperties(m, c, &lt, padPinName, leaf);
+    return leaf;
+}
+
+// The two builders.
+void BuildUnfolded(Design& d, Nlw_NlView& view);
+void BuildFlat(Design& d, Nlw_NlView& view);
+
+// Locates the first syntax fault of a JSON text (Nlw_JsonReader_Syntax.cpp):
+// its byte offset, or npos when the text has none this check finds.
+size_t FindSyntaxError(const char* text, size_t len);
+
+}  // namespace nlw_json

@@ -1,0 +1,81 @@
+// The preparation pass: installation data into the writer, and each library
+// cell's parameters into its external property list.
+#include "reader/Nlw_Prep.h"
+
+#include <string>
+#include <unordered_map>
+
+#include "framework/Nlw_NetlistWriter.h"
+#include "framework/Nlw_Util.h"
+#include "port/Port.h"
+#include "port/UT.h"
+#include "reader/Nlw_JsonReader.h"
+
+namespace {
+
+using Definitions = std::vector<Nlw_Property>;
+
+void PrepareBlock(Nlw_NetlistWriter& nlw, Nlw_NlBlock* block, const Definitions* defs) {
+    size_t count = Nlw_JsonReader::GetParameterCount(*block);
+    if (count == 0) {
+        block->SetExternalProperties(nullptr);
+        return;
+    }
+    const std::vector<Vdm_Property*>& props = *block->GetProperties();
+    std::unique_ptr<Vdm_Property> list(Vdm_Property::NewList("NLW_EXTERNAL_PROPERTIES"));
+    std::string literal;
+    for (size_t k = 0; k < count; ++k) {
+        Vdm_Property* p = props[k];
+        if (defs) {
+            // A parameter the table does not define is not simulatable.
+            const Nlw_Property* def =
+                Nlw_Property::Find(*defs, Nlw_Property::ParameterName(p->GetName()));
+            if (!def) continue;
+            std::unique_ptr<Vdm_Property> converted = Nlw_Prep::Convert(*p, def->GetType().c_str());
+            nlw.AddIfSimulatableProperty(block, converted ? converted.get() : p, list.get());
+        } else if (Nlw_Prep::VerilogLiteral(*p, literal)) {
+            list->CreatePropertyString(p->GetName(), literal.c_str());
+        }
+    }
+    block->SetExternalProperties(list->GetCount() ? list.release() : nullptr);
+}
+
+}  // namespace
+
+Ldm_TypeLib* Nlw_Prep::LoadInstallationData(Nlw_NetlistWriter& nlw) {
+    const char* found = Port_Env::GetDataFileName("simprops.dat", 0);
+    if (!found) return nullptr;
+    std::string path = found;
+    if (!nlw.LoadSimPropTable(path.c_str())) return nullptr;
+    auto* lib = new Ldm_TypeLib;
+    for (const auto& entry : nlw.simPropTable) {
+        Ldm_TypeBlock* type = lib->AddBlock(entry.first.c_str());
+        if (!entry.second) continue;
+        for (const Nlw_Property& def : *entry.second) {
+            const char* t = def.GetType().c_str();
+            if (UT_STR::ICompare(t, "HV") != 0 && UT_STR::ICompare(t, "BV") != 0) continue;
+            type->AddDefinition(
+                "Config_General_Data",
+                Vdm_Property::NewTypeDef(def.GetName().c_str(), {def.GetDefault().str()}));
+        }
+    }
+    return lib;
+}
+
+void Nlw_Prep::PrepareProperties(Nlw_NetlistWriter& nlw) {
+    Nlw_NlView* view = nlw.GetView();
+    if (!view) return;
+    // The table's definitions per library type, looked up once per type.
+    std::unordered_map<const Nlw_NlType*, const Definitions*> defsOf;
+    for (const Nlw_NlType* type : view->GetTypes()) {
+        if (type->IsModule()) continue;
+        auto it = nlw.simPropTable.find(Port::String(type->GetName()));
+        defsOf.emplace(type, it == nlw.simPropTable.end() ? nullptr : it->second);
+    }
+    for (Nlw_NlBlock* macro : view->GetMacros())
+        for (Nlw_NlBlock* child : macro->GetChildren()) {
+            if (child->IsMacro()) continue;
+            auto it = defsOf.find(child->GetType());
+            PrepareBlock(nlw, child, it == defsOf.end() ? nullptr : it->second);
+        }
+}

@@ -1,0 +1,101 @@
+// Helpers shared by the host service tests: scratch directories, files,
+// environment settings and minimal writer classes.
+#pragma once
+
+#include <gtest/gtest.h>
+#include <stdlib.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <cstdio>
+#include <fstream>
+#include <sstream>
+#include <string>
+
+#include "TestFiles.h"
+#include "framework/Nlw_NetlistWriter.h"
+#include "framework/Nlw_Writer.h"
+#include "port/Port.h"
+
+namespace hosttest {
+
+using nlwtest::Exists;
+using nlwtest::ReadFile;
+using nlwtest::TempDir;
+using nlwtest::WriteFile;
+
+inline void MakeDirs(const std::string& path) {
+    std::system(("mkdir -p '" + path + "'").c_str());
+}
+
+// Names in dir, one per line, sorted.
+inline std::string ListDir(const std::string& dir) {
+    std::string out;
+    FILE* p = ::popen(("ls -A '" + dir + "'").c_str(), "r");
+    char line[512];
+    while (p && std::fgets(line, sizeof line, p)) out += line;
+    if (p) ::pclose(p);
+    return out;
+}
+
+// Sets (or, with null, unsets) an environment variable for a scope and
+// makes the installation roots be read again on both ends.
+class EnvSetting {
+public:
+    EnvSetting(const char* name, const char* value) : name_(name) {
+        if (const char* old = ::getenv(name)) {
+            had_ = true;
+            old_ = old;
+        }
+        if (value)
+            ::setenv(name, value, 1);
+        else
+            ::unsetenv(name);
+        Port::VornixPath::Reset();
+    }
+    ~EnvSetting() {
+        if (had_)
+            ::setenv(name_.c_str(), old_.c_str(), 1);
+        else
+            ::unsetenv(name_.c_str());
+        Port::VornixPath::Reset();
+    }
+
+private:
+    std::string name_, old_;
+    bool had_ = false;
+};
+
+// Keeps expected messages off the terminal while capturing them.
+class QuietCapture : public Port_MsgCapture {
+public:
+    QuietCapture() { Port_MsgManager::Instance().SetConsole(false); }
+    ~QuietCapture() override { Port_MsgManager::Instance().SetConsole(true); }
+    size_t Count(Port_MsgLevel level) const { return Texts(level).size(); }
+};
+
+// A netlist writer with the format operations stubbed out.
+class StubNetlistWriter : public Nlw_NetlistWriter {
+public:
+    HelpFunction GetHelp() override { return nullptr; }
+    const char** GetReservedWords() override { return nullptr; }
+    unsigned char IsEscaped(const char*) override { return 0; }
+    const char* Escape(const char* name, unsigned char) override { return name; }
+    const char* GetRangeString(Nlw_NlBus*) override { return ""; }
+    const char* GetIndexesString(DARRAY_Util_INT32*) override { return ""; }
+    void WriteDesign() override {}
+    void WriteHeader(Nlw_Writer*) override {}
+    unsigned char AddIfSimulatableProperty(Nlw_NlBlock*, Vdm_Property*, Vdm_Property*) override {
+        return 0;
+    }
+};
+
+// A file writer that writes nothing of its own.
+class PlainWriter : public Nlw_Writer {
+public:
+    using Nlw_Writer::Nlw_Writer;
+    void WriteView(Nlw_NlView*, unsigned char) override {}
+    void WriteBlock(Nlw_NlBlock*) override {}
+};
+
+}  // namespace hosttest

@@ -1,0 +1,135 @@
+// The netlist writer base: padding, device data and the simulatable
+// property table.
+#include <gtest/gtest.h>
+
+#include <string>
+#include <vector>
+
+#include "HostTestSupport.h"
+#include "framework/Nlw_NetlistWriter.h"
+
+namespace {
+
+using hosttest::EnvSetting;
+using hosttest::MakeDirs;
+using hosttest::QuietCapture;
+using hosttest::StubNetlistWriter;
+using hosttest::TempDir;
+using hosttest::WriteFile;
+
+// "CELL:PARAM:TYPE:DEFAULT" per definition, in table order.
+std::vector<std::string> Dump(const Nlw_NetlistWriter& nlw) {
+    std::vector<std::string> out;
+    for (const auto& entry : nlw.simPropTable)
+        for (const Nlw_Property& p : *entry.second)
+            out.push_back(std::string(entry.first.c_str()) + ":" + p.GetName().c_str() + ":" +
+                          p.GetType().c_str() + ":" + p.GetDefault().c_str());
+    return out;
+}
+
+TEST(NetlistWriter, PadOrTrimKeepsLeastSignificantDigits) {
+    struct Case {
+        size_t count;
+        const char* text;
+        const char* fill;
+        const char* result;
+    };
+    const Case cases[] = {
+        {3, "AB", "0", "0AB"}, {3, "ABC", "0", "ABC"},   {3, "ABCDE", "0", "CDE"},
+        {0, "AB", "0", ""},    {4, "", "0", "0000"},     {5, "1", "xy", "xxxx1"},
+        {3, "7", "", "007"},   {3, "7", nullptr, "007"},
+    };
+    StubNetlistWriter nlw;
+    for (const Case& c : cases) {
+        Port::String text(c.text);
+        nlw.PadOrTrim(c.count, text, c.fill);
+        EXPECT_STREQ(text.c_str(), c.result) << c.count << " " << c.text;
+    }
+}
+
+TEST(NetlistWriter, DevkeyWithoutViewUsesAnEmptyPart) {
+    TempDir dir;
+    MakeDirs(dir / "data");
+    WriteFile(dir / "data/device.key", "HexStringProperty = INIT\n");
+    EnvSetting root("VORNIX", dir.path().c_str());
+    StubNetlistWriter nlw;
+    EXPECT_STREQ(nlw.GetPmPic()->get_partname(), "");
+    PM_DEVKEY* key = nlw.GetDevkey();
+    ASSERT_NE(key, nullptr);
+    EXPECT_EQ(nlw.GetDevkey(), key);  // made once
+    EXPECT_STREQ(key->getstringbykey("HexStringProperty", ",", 0, nullptr, 0), "INIT");
+}
+
+TEST(NetlistWriter, LoadsTheSimulatablePropertyTable) {
+    TempDir dir;
+    WriteFile(dir / "sim.tbl",
+              "# CELLTYPE PARAM TYPE DEFAULT\n"
+              "X_LUT4   INIT    HV  16'h0000\n"
+              "\n"
+              "X_FF\tINIT\tbl\tFALSE   # trailing comment\r\n"
+              "x_lut4   MODE    S   \"A\"\n"  // same cell type, other case
+              "X_RAM    WIDTH   I   4\n"
+              "X_LUT4   INIT    BV  4'b0000\n"  // a second definition is kept after the first
+              "   # indented comment\n");
+    StubNetlistWriter nlw;
+    QuietCapture capture;
+    ASSERT_TRUE(nlw.LoadSimPropTable((dir / "sim.tbl").c_str()));
+    EXPECT_TRUE(capture.msgs.empty());
+    using V = std::vector<std::string>;
+    EXPECT_EQ(Dump(nlw), (V{"X_FF:INIT:bl:FALSE", "X_LUT4:INIT:HV:16'h0000", "X_LUT4:MODE:S:\"A\"",
+                            "X_LUT4:INIT:BV:4'b0000", "X_RAM:WIDTH:I:4"}));
+    // Lookup ignores case.
+    EXPECT_NE(nlw.simPropTable.find(Port::String("x_ram")), nlw.simPropTable.end());
+}
+
+TEST(NetlistWriter, BadOrMissingTableChangesNothing) {
+    TempDir dir;
+    struct Case {
+        const char* content;
+        int line;
+    };
+    const Case cases[] = {
+        {"A P I 1\nA P I\n", 2},    // a field missing
+        {"A P I 1 extra\n", 1},     // a field too many
+        {"\n# c\nA P HEX 0\n", 3},  // unknown type
+    };
+    for (const Case& c : cases) {
+        WriteFile(dir / "bad.tbl", c.content);
+        StubNetlistWriter nlw;
+        nlw.AddSimProperty("KEEP", "P", "I", "0");
+        QuietCapture capture;
+        EXPECT_FALSE(nlw.LoadSimPropTable((dir / "bad.tbl").c_str())) << c.content;
+        std::vector<std::string> errors = capture.Texts(Port_MsgLevel::Error);
+        ASSERT_EQ(errors.size(), 1u) << c.content;
+        EXPECT_NE(errors[0].find("line " + std::to_string(c.line) + " "), std::string::npos)
+            << errors[0];
+        EXPECT_NE(errors[0].find(dir / "bad.tbl"), std::string::npos) << errors[0];
+        EXPECT_EQ(Dump(nlw), std::vector<std::string>{"KEEP:P:I:0"});
+    }
+    // A missing table is silent; a directory in its place is unreadable.
+    StubNetlistWriter nlw;
+    QuietCapture capture;
+    EXPECT_FALSE(nlw.LoadSimPropTable((dir / "none.tbl").c_str()));
+    EXPECT_FALSE(nlw.LoadSimPropTable(nullptr));
+    EXPECT_TRUE(capture.msgs.empty());
+    EXPECT_FALSE(nlw.LoadSimPropTable(dir.path().c_str()));
+    EXPECT_EQ(capture.Count(Port_MsgLevel::Error), 1u);
+}
+
+TEST(NetlistWriter, CopyHasItsOwnTable) {
+    StubNetlistWriter nlw;
+    nlw.AddSimProperty("X_LUT4", "INIT", "HV", "16'h0000");
+    std::vector<Nlw_Property> hostList{Nlw_Property("W", "I", "1")};
+    nlw.simPropTable.emplace(Port::String("HOST"), &hostList);
+    StubNetlistWriter copy(nlw);
+    nlw.AddSimProperty("X_LUT4", "MODE", "S", "A");
+    EXPECT_EQ(Dump(copy), (std::vector<std::string>{"HOST:W:I:1", "X_LUT4:INIT:HV:16'h0000"}));
+    EXPECT_EQ(copy.simPropTable.find(Port::String("HOST"))->second, &hostList);
+    StubNetlistWriter assigned;
+    assigned = nlw;
+    EXPECT_EQ(Dump(assigned), Dump(nlw));
+    const Port::String lut("X_LUT4");
+    EXPECT_NE(assigned.simPropTable.find(lut)->second, nlw.simPropTable.find(lut)->second);
+}
+
+}  // namespace

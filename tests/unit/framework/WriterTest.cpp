@@ -1,0 +1,321 @@
+// The file writer base: text layout, buffering, the temporary file, access
+// modes and failures; the property output filter.
+#include <gtest/gtest.h>
+#include <signal.h>
+#include <sys/resource.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <string>
+
+#include "HostTestSupport.h"
+#include "framework/Nlw_Writer.h"
+
+namespace {
+
+using hosttest::Exists;
+using hosttest::ListDir;
+using hosttest::PlainWriter;
+using hosttest::QuietCapture;
+using hosttest::ReadFile;
+using hosttest::TempDir;
+using hosttest::WriteFile;
+
+void WriteSample(Nlw_Writer& w) {
+    w.WriteL("module top (a);");
+    w.UpIndent();
+    w.WriteIL("input a;");
+    w.WriteI("wire ");
+    w.Write("b", 0, 0);
+    w.WriteL(";");
+    w.UpIndent();
+    w.WriteIL("deeper");
+    w.DownIndent();
+    w.DownIndent();
+    w.DownIndent();  // below zero stays at zero
+    w.WriteIL("endmodule");
+    w.Write(nullptr, 0, 0);
+    w.WriteL("");
+}
+
+const char* const kSample =
+    "module top (a);\n"
+    "  input a;\n"
+    "  wire b;\n"
+    "    deeper\n"
+    "endmodule\n"
+    "\n";
+
+TEST(Writer, MemoryModeKeepsTheText) {
+    PlainWriter w(nullptr, "unused.v", Port::Stream::Memory);
+    WriteSample(w);
+    EXPECT_EQ(w.GetMemoryText(), kSample);
+    EXPECT_TRUE(w.Close());
+    w.WriteL("after close");
+    EXPECT_EQ(w.GetMemoryText(), kSample);
+    // Two blanks a level, however deep.
+    PlainWriter deep(nullptr, nullptr, Port::Stream::Memory);
+    for (int i = 0; i < 40; ++i) deep.UpIndent();
+    deep.WriteIL("x");
+    EXPECT_EQ(deep.GetMemoryText(), std::string(80, ' ') + "x\n");
+}
+
+// The text goes to a temporary beside the file, renamed when closed.
+TEST(Writer, FileGetsExactlyTheTextOnlyWhenClosed) {
+    TempDir dir;
+    const std::string path = dir / "top.v";
+    std::string expected = kSample;
+    PlainWriter w(nullptr, path.c_str(), Port::Stream::Create);
+    EXPECT_TRUE(w.IsOk());
+    WriteSample(w);
+    // Several flushes, lines crossing flush boundaries.
+    for (int i = 0; i < 60000; ++i) {
+        std::string line = "  assign n" + std::to_string(i) + " = " + std::string(i % 37, 'x');
+        w.WriteL(line.c_str());
+        expected += line + "\n";
+    }
+    ASSERT_GT(expected.size(), 3 * Nlw_Writer::kFlushSize);
+    EXPECT_FALSE(Exists(path));
+    EXPECT_EQ(ListDir(dir.path()), "top.v.tmp" + std::to_string(::getpid()) + "\n");
+    EXPECT_TRUE(w.Close());
+    EXPECT_EQ(ReadFile(path), expected);
+    EXPECT_EQ(ListDir(dir.path()), "top.v\n");
+    EXPECT_TRUE(w.Close());  // closing again changes nothing
+}
+
+TEST(Writer, CreateRefusesAnExistingFileAndKeepsIt) {
+    TempDir dir;
+    const std::string path = dir / "top.v";
+    WriteFile(path, "precious\n");
+    QuietCapture capture;
+    {
+        PlainWriter w(nullptr, path.c_str(), Port::Stream::Create);
+        EXPECT_FALSE(w.IsOk());
+        WriteSample(w);
+        EXPECT_FALSE(w.Close());
+    }
+    EXPECT_EQ(ReadFile(path), "precious\n");
+    EXPECT_EQ(ListDir(dir.path()), "top.v\n");
+    EXPECT_EQ(
+        capture.Texts(Port_MsgLevel::Error),
+        std::vector<std::string>{"Output file '" + path + "' exists; use -w to overwrite it.\n"});
+    EXPECT_EQ(capture.msgs.size(), 1u);
+    // Nor does it replace a file made while writing.
+    ::unlink(path.c_str());
+    {
+        PlainWriter w(nullptr, path.c_str(), Port::Stream::Create);
+        WriteSample(w);
+        WriteFile(path, "someone else's\n");
+    }
+    EXPECT_EQ(ReadFile(path), "someone else's\n");
+    EXPECT_EQ(ListDir(dir.path()), "top.v\n");
+    EXPECT_EQ(capture.Count(Port_MsgLevel::Error), 2u);
+}
+
+TEST(Writer, ReplaceReplacesAnExistingFile) {
+    TempDir dir;
+    const std::string path = dir / "top.v";
+    WriteFile(path, std::string(100000, 'o'));
+    QuietCapture capture;
+    {
+        PlainWriter w(nullptr, path.c_str(), Port::Stream::Replace);
+        // The old file stays whole while the new one is written.
+        w.WriteL("new");
+        EXPECT_EQ(ReadFile(path).size(), 100000u);
+    }
+    EXPECT_EQ(ReadFile(path), "new\n");
+    EXPECT_TRUE(capture.msgs.empty());
+}
+
+TEST(Writer, UnwritablePlacesGiveOneErrorAndNoFile) {
+    TempDir dir;
+    WriteFile(dir / "plain", "x");
+    hosttest::MakeDirs(dir / "sub");
+    struct Case {
+        std::string path;
+        Port::Stream::Access access;
+        const char* reason;
+    };
+    const Case cases[] = {
+        {dir / "missing/top.v", Port::Stream::Create, "No such file or directory"},
+        {dir / "plain/top.v", Port::Stream::Replace, "Not a directory"},
+        {dir / "sub", Port::Stream::Replace, "Is a directory"},
+        {"", Port::Stream::Replace, "no file name was given"},
+        {dir / "read.v", Port::Stream::Read, "the file is not opened for writing"},
+    };
+    for (const Case& c : cases) {
+        QuietCapture capture;
+        {
+            PlainWriter w(nullptr, c.path.c_str(), c.access);
+            EXPECT_FALSE(w.IsOk()) << c.path;
+            WriteSample(w);
+            EXPECT_FALSE(w.Close());
+        }
+        EXPECT_EQ(
+            capture.Texts(Port_MsgLevel::Error),
+            std::vector<std::string>{"Cannot write file '" + c.path + "': " + c.reason + "\n"});
+        EXPECT_EQ(capture.msgs.size(), 1u);
+    }
+    EXPECT_EQ(ListDir(dir.path()), "plain\nsub\n");
+    EXPECT_EQ(ListDir(dir / "sub"), "");
+}
+
+TEST(Writer, DevicesAreWrittenInPlace) {
+    QuietCapture capture;
+    {
+        PlainWriter w(nullptr, "/dev/null", Port::Stream::Replace);
+        WriteSample(w);
+        EXPECT_TRUE(w.Close());
+    }
+    struct stat st;
+    ASSERT_EQ(::stat("/dev/null", &st), 0);
+    EXPECT_TRUE(S_ISCHR(st.st_mode));
+    EXPECT_TRUE(capture.msgs.empty());
+}
+
+TEST(Writer, ReplaceThroughALinkKeepsTheLink) {
+    TempDir dir;
+    hosttest::MakeDirs(dir / "real");
+    WriteFile(dir / "real/top.v", "old\n");
+    ASSERT_EQ(::symlink((dir / "real/top.v").c_str(), (dir / "top.v").c_str()), 0);
+    {
+        PlainWriter w(nullptr, (dir / "top.v").c_str(), Port::Stream::Replace);
+        w.WriteL("new");
+    }
+    struct stat st;
+    ASSERT_EQ(::lstat((dir / "top.v").c_str(), &st), 0);
+    EXPECT_TRUE(S_ISLNK(st.st_mode));
+    EXPECT_EQ(ReadFile(dir / "real/top.v"), "new\n");
+    EXPECT_EQ(ListDir(dir / "real"), "top.v\n");
+}
+
+// Makes the file size limit small for a scope, with the signal that would
+// end the process ignored so that writes fail with an error instead.
+class FileSizeLimit {
+public:
+    explicit FileSizeLimit(rlim_t bytes) {
+        ::getrlimit(RLIMIT_FSIZE, &old_);
+        oldHandler_ = ::signal(SIGXFSZ, SIG_IGN);
+        struct rlimit lim = old_;
+        lim.rlim_cur = bytes;
+        ::setrlimit(RLIMIT_FSIZE, &lim);
+    }
+    ~FileSizeLimit() {
+        ::setrlimit(RLIMIT_FSIZE, &old_);
+        ::signal(SIGXFSZ, oldHandler_);
+    }
+
+private:
+    struct rlimit old_;
+    sighandler_t oldHandler_;
+};
+
+TEST(Writer, FailedWriteLeavesOldFileAndNoTemporary) {
+    TempDir dir;
+    const std::string path = dir / "top.v";
+    WriteFile(path, "old netlist\n");
+    QuietCapture capture;
+    {
+        PlainWriter w(nullptr, path.c_str(), Port::Stream::Replace);
+        {
+            FileSizeLimit limit(64 * 1024);
+            for (int i = 0; i < 20000 && w.IsOk(); ++i)
+                w.WriteL("a line of a netlist that will not fit below the size limit");
+        }
+        EXPECT_FALSE(w.IsOk());
+        w.WriteL("discarded");
+        EXPECT_FALSE(w.Close());
+    }
+    EXPECT_EQ(ReadFile(path), "old netlist\n");
+    EXPECT_EQ(ListDir(dir.path()), "top.v\n");
+    EXPECT_EQ(capture.Texts(Port_MsgLevel::Error),
+              std::vector<std::string>{"Cannot write file '" + path + "': File too large\n"});
+}
+
+TEST(Writer, FailureAtCloseIsReported) {
+    TempDir dir;
+    const std::string path = dir / "top.v";
+    QuietCapture capture;
+    {
+        PlainWriter w(nullptr, path.c_str(), Port::Stream::Create);
+        w.WriteL(std::string(1000, 'z').c_str());  // stays in the buffer until Close
+        FileSizeLimit limit(10);
+        EXPECT_FALSE(w.Close());
+    }
+    EXPECT_FALSE(Exists(path));
+    EXPECT_EQ(ListDir(dir.path()), "");
+    EXPECT_EQ(capture.Count(Port_MsgLevel::Error), 1u);
+}
+
+TEST(Writer, CopyDiscardsItsOutput) {
+    TempDir dir;
+    const std::string path = dir / "top.v";
+    QuietCapture capture;
+    {
+        PlainWriter w(nullptr, path.c_str(), Port::Stream::Create);
+        w.UpIndent();
+        w.WriteIL("original");
+        PlainWriter copy(w);
+        EXPECT_STREQ(copy.GetFileName(), path.c_str());
+        EXPECT_EQ(copy.GetIndent(), 1);
+        EXPECT_FALSE(copy.IsOk());
+        copy.WriteIL("from the copy");
+        EXPECT_TRUE(copy.GetMemoryText().empty());
+
+        PlainWriter other(nullptr, (dir / "other.v").c_str(), Port::Stream::Create);
+        other.WriteL("other text");
+        other = w;  // closes other.v first
+        other.WriteL("discarded");
+    }
+    EXPECT_EQ(ReadFile(path), "  original\n");
+    EXPECT_EQ(ReadFile(dir / "other.v"), "other text\n");
+    EXPECT_TRUE(capture.msgs.empty());
+}
+
+TEST(PropOutFilter, NamesAndPatternsIgnoringCaseFromAReadableFile) {
+    TempDir dir;
+    WriteFile(dir / "vdm2ver.pfd",
+              "# properties kept out of the netlist\n"
+              "LOC, RLOC   BEL\n"
+              "\tinit_*  # every init\r\n"
+              "*_PATH\n"
+              "\n");
+    Vdh_PropOutFilter filter((dir / "vdm2ver.pfd").c_str(), nullptr);
+    EXPECT_TRUE(filter.IsLoaded());
+    struct Case {
+        const char* name;
+        bool filtered;
+    };
+    const Case cases[] = {
+        {"loc", true},    {"RLOC", true},      {"BEL", true},   {"Init_A", true},
+        {"INIT", false},  {"DATA_PATH", true}, {"PATH", false}, {"LOCX", false},
+        {"every", false}, {"#", false},        {"", false},
+    };
+    for (const Case& c : cases) EXPECT_EQ(filter.IsFiltered(c.name), c.filtered) << c.name;
+    EXPECT_FALSE(filter.IsFiltered(nullptr));
+
+    // An unreadable file is warned about and filters nothing.
+    QuietCapture capture;
+    Vdh_PropOutFilter none((dir / "none.pfd").c_str(), nullptr);
+    EXPECT_FALSE(none.IsLoaded());
+    EXPECT_FALSE(none.IsFiltered("LOC"));
+    EXPECT_EQ(capture.Count(Port_MsgLevel::Warning), 1u);
+}
+
+TEST(PropOutFilter, WriterAsksTheFilter) {
+    TempDir dir;
+    WriteFile(dir / "f.pfd", "LOC\n");
+    Vdh_PropOutFilter filter((dir / "f.pfd").c_str(), nullptr);
+    PlainWriter w(nullptr, nullptr, Port::Stream::Memory);
+    std::unique_ptr<Vdm_Property> loc(Vdm_Property::NewString("LOC", "X0Y0"));
+    std::unique_ptr<Vdm_Property> init(Vdm_Property::NewString("INIT", "1'b0"));
+    Vdm_PropertyHolder holder;
+    EXPECT_EQ(w.IsExternalProperty(loc.get(), &holder), 1);
+    w.SetExtPropFilter(&filter);
+    EXPECT_EQ(w.IsExternalProperty(loc.get(), &holder), 0);
+    EXPECT_EQ(w.IsExternalProperty(init.get(), &holder), 1);
+    EXPECT_EQ(w.IsExternalProperty(loc.get(), static_cast<Nlw_NlBlock*>(nullptr)), 0);
+    EXPECT_EQ(w.FindExternalProperties(nullptr), nullptr);
+}
+
+}  // namespace

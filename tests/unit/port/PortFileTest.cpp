@@ -1,0 +1,198 @@
+// Files, line reading, installation roots and data file lookup.
+#include <gtest/gtest.h>
+
+#include <string>
+#include <vector>
+
+#include "HostTestSupport.h"
+#include "port/Port.h"
+
+namespace {
+
+using hosttest::EnvSetting;
+using hosttest::MakeDirs;
+using hosttest::TempDir;
+using hosttest::WriteFile;
+
+std::vector<std::string> LinesInPieces(const std::string& path, int size) {
+    Port::Stream stream(Port::Stream::Read, 4096);
+    std::vector<std::string> out;
+    if (!Port::File::open(path.c_str(), stream, 0)) return out;
+    std::vector<char> buf(static_cast<size_t>(size));
+    while (stream.readline(buf.data(), size)) out.push_back(buf.data());
+    return out;
+}
+
+std::vector<std::string> WholeLines(const std::string& path, size_t bufferSize = 4096) {
+    Port::Stream stream(Port::Stream::Read, bufferSize);
+    std::vector<std::string> out;
+    if (!Port::File::open(path.c_str(), stream, 0)) return out;
+    std::string line;
+    while (stream.readline(line)) out.push_back(line);
+    return out;
+}
+
+TEST(PortFile, ExistOpenAndReadAll) {
+    TempDir dir;
+    const std::string file = dir / "f.txt", none = dir / "none";
+    std::string big(300000, 'b');
+    WriteFile(file, big);
+    EXPECT_TRUE(Port::File::exist(file.c_str()) && !Port::File::isdir(file.c_str()));
+    EXPECT_TRUE(Port::File::exist(dir.path().c_str()) && Port::File::isdir(dir.path().c_str()));
+    EXPECT_FALSE(Port::File::exist(none.c_str()) || Port::File::isdir(none.c_str()));
+    EXPECT_FALSE(Port::File::exist(nullptr) || Port::File::exist(""));
+
+    // Missing files and directories are not opened.
+    Port::Stream stream(Port::Stream::Read, 4096);
+    EXPECT_FALSE(Port::File::open(none.c_str(), stream, 0));
+    EXPECT_FALSE(Port::File::open(dir.path().c_str(), stream, 0));
+    EXPECT_FALSE(stream.isOpen());
+    char buf[8];
+    EXPECT_EQ(stream.readline(buf, sizeof buf), 0);
+
+    std::string content, error;
+    EXPECT_TRUE(Port::File::readAll(file.c_str(), content, &error));
+    EXPECT_EQ(content, big);
+    EXPECT_FALSE(Port::File::readAll(none.c_str(), content, &error));
+    EXPECT_EQ(error, "No such file or directory");
+    EXPECT_FALSE(Port::File::readAll(dir.path().c_str(), content, &error));
+}
+
+TEST(PortStream, ReadlineStripsLineEnds) {
+    TempDir dir;
+    using V = std::vector<std::string>;
+    struct Case {
+        const char* content;
+        V lines;
+    };
+    const Case cases[] = {
+        {"", V{}},
+        {"a\nb", V{"a", "b"}},  // last line without a line end
+        {"a\r\nb\r\n", V{"a", "b"}},
+        {"a\rb\n", V{"a\rb"}},  // a lone carriage return is text
+        {"\n\nx\n\n", V{"", "", "x", ""}},
+        {"end\r", V{"end\r"}},
+    };
+    for (const Case& c : cases) {
+        WriteFile(dir / "f", c.content);
+        EXPECT_EQ(LinesInPieces(dir / "f", 1024), c.lines) << c.content;
+        EXPECT_EQ(WholeLines(dir / "f"), c.lines) << c.content;
+        EXPECT_EQ(WholeLines(dir / "f", 2), c.lines) << c.content;  // tiny read buffer
+    }
+}
+
+TEST(PortStream, LongLinesComeInPieces) {
+    TempDir dir;
+    using V = std::vector<std::string>;
+    WriteFile(dir / "f", "abcdefghij\nxy\n");
+    // size 4: three characters a piece.
+    EXPECT_EQ(LinesInPieces(dir / "f", 4), (V{"abc", "def", "ghi", "j", "xy"}));
+    // A line that fills the last piece exactly gives no empty piece after it.
+    WriteFile(dir / "f", "abcdef\nxyz\r\nq\n");
+    EXPECT_EQ(LinesInPieces(dir / "f", 4), (V{"abc", "def", "xyz", "q"}));
+    // A size that cannot hold a character reads nothing.
+    char one[1];
+    Port::Stream stream(Port::Stream::Read, 4096);
+    ASSERT_TRUE(Port::File::open((dir / "f").c_str(), stream, 0));
+    EXPECT_EQ(stream.readline(one, 1), 0);
+}
+
+TEST(PortStream, LongLinesAcrossBufferBoundaries) {
+    TempDir dir;
+    // Lines around the stream's buffer size, with CRLF line ends straddling
+    // buffer refills.
+    std::string content;
+    std::vector<std::string> expected;
+    for (size_t len : {4094u, 4095u, 4096u, 4097u, 10000u, 0u, 1u}) {
+        std::string line(len, 'k');
+        expected.push_back(line);
+        content += line + "\r\n";
+    }
+    WriteFile(dir / "f", content);
+    EXPECT_EQ(WholeLines(dir / "f"), expected);
+    EXPECT_EQ(WholeLines(dir / "f", 7), expected);
+    // The pieces of a 1024-byte buffer join to the text without line ends.
+    std::string joined, all;
+    for (const std::string& p : LinesInPieces(dir / "f", 1024)) joined += p;
+    for (const std::string& l : expected) all += l;
+    EXPECT_EQ(joined, all);
+}
+
+TEST(VornixPath, SplitsTheVariable) {
+    const std::pair<const char*, std::vector<std::string>> cases[] = {
+        {"/opt/one:/opt/two", {"/opt/one", "/opt/two"}},
+        {":/a::/b:", {"/a", "/b"}},
+        {"", {}},
+        // The test program has no installation beside it, so the source
+        // tree's share directory is used.
+        {nullptr, {NLW_SOURCE_SHARE_DIR}},
+    };
+    for (const auto& c : cases) {
+        EnvSetting v("VORNIX", c.first);
+        const Port::PathList& roots = Port::VornixPath::GetInstance();
+        std::vector<std::string> got;
+        for (size_t i = 0; i < roots.size(); ++i) got.push_back(roots[i]);
+        EXPECT_EQ(got, c.second) << c.first;
+        // Set but empty is not unset.
+        EXPECT_EQ(Port_Env::GetEnv("VORNIX") != nullptr, c.first != nullptr);
+    }
+}
+
+TEST(VornixPath, CachedUntilReset) {
+    EnvSetting v("VORNIX", "/first");
+    const Port::PathList& before = Port::VornixPath::GetInstance();
+    ::setenv("VORNIX", "/second", 1);
+    EXPECT_STREQ(Port::VornixPath::GetInstance()[0], "/first");
+    Port::VornixPath::Reset();
+    EXPECT_STREQ(Port::VornixPath::GetInstance()[0], "/second");
+    // A list handed out earlier stays readable.
+    EXPECT_STREQ(before[0], "/first");
+}
+
+TEST(VornixPath, LooksUpInTheFirstRootHoldingThePath) {
+    TempDir dir;
+    // r0 is a file, not a root; r1 holds "lib" as a file and "m.v" as a
+    // directory, so both lookups must go on to r2.
+    WriteFile(dir / "r0", "x");
+    MakeDirs(dir / "r1/src/m.v");
+    WriteFile(dir / "r1/src/lib", "x");
+    MakeDirs(dir / "r2/src/lib");
+    WriteFile(dir / "r2/src/m.v", "second\n");
+    MakeDirs(dir / "r3/src");
+    WriteFile(dir / "r3/src/m.v", "third\n");
+    const std::string roots = (dir / "none") + ":" + (dir / "r0") + ":" + (dir / "r1") + ":" +
+                              (dir / "r2") + ":" + (dir / "r3");
+    EnvSetting v("VORNIX", roots.c_str());
+
+    EXPECT_EQ(Port::VornixPath::FindDirectory("src/lib"), dir / "r2/src/lib");
+    EXPECT_EQ(Port::VornixPath::FindDirectory("src/missing"), "");
+    Port::Stream stream(Port::Stream::Read, 4096);
+    ASSERT_TRUE(Port::VornixPath::OpenFile("src/m.v", stream));
+    std::string line;
+    ASSERT_TRUE(stream.readline(line));
+    EXPECT_EQ(line, "second");
+    EXPECT_FALSE(Port::VornixPath::OpenFile("src/none.v", stream));
+}
+
+TEST(PortEnv, DataFileFromTheFirstRootHoldingIt) {
+    TempDir dir;
+    MakeDirs(dir / "r1/data");
+    MakeDirs(dir / "r2/data");
+    MakeDirs(dir / "r2/data/dirname");
+    WriteFile(dir / "r1/data/only1.acd", "x");
+    WriteFile(dir / "r2/data/both.pfd", "2");
+    WriteFile(dir / "r1/data/both.pfd", "1");
+    WriteFile(dir / "r2/data/only2.key", "x");
+    EnvSetting v("VORNIX", (dir / "none:" + dir.path() + "/r1:" + dir.path() + "/r2").c_str());
+    EXPECT_EQ(std::string(Port_Env::GetDataFileName("both.pfd", 1)), dir / "r1/data/both.pfd");
+    EXPECT_EQ(std::string(Port_Env::GetDataFileName("only2.key", 0)), dir / "r2/data/only2.key");
+    EXPECT_EQ(Port_Env::GetDataFileName("missing", 1), nullptr);
+    EXPECT_EQ(Port_Env::GetDataFileName("dirname", 1), nullptr);
+    EXPECT_EQ(Port_Env::GetDataFileName(nullptr, 1), nullptr);
+    // The returned text outlives further lookups.
+    const char* kept = Port_Env::GetDataFileName("both.pfd", 1);
+    for (int i = 0; i < 20; ++i) Port_Env::GetDataFileName("only1.acd", 1);
+    EXPECT_EQ(std::string(kept), dir / "r1/data/both.pfd");
+}
+
+}  // namespace

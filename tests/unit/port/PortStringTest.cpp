@@ -1,0 +1,121 @@
+// Formatted text and the host string.
+#include <gtest/gtest.h>
+
+#include <string>
+#include <vector>
+
+#include "port/Port.h"
+
+namespace {
+
+using Port::String;
+using V = std::vector<std::string>;
+
+TEST(Vorform, NeverTruncatesLongText) {
+    EXPECT_STREQ(vorform("%d'h%s|%-4s|", 16, "ABCD", "ab"), "16'hABCD|ab  |");
+    // Far beyond any buffer a fixed-size implementation would have.
+    for (size_t len : {255u, 256u, 1024u, 4097u, 2000000u}) {
+        std::string big(len, 'x');
+        big.back() = 'y';
+        EXPECT_EQ(std::string(vorform("<%s>", big.c_str())), "<" + big + ">") << len;
+    }
+    std::string out = "head:";
+    Port_AppendFormat(out, "%s=%d;", "a", 1);
+    Port_AppendFormat(out, "%s", std::string(70000, 'q').c_str());
+    Port_AppendFormat(out, "%s", "");
+    EXPECT_EQ(out, "head:a=1;" + std::string(70000, 'q'));
+}
+
+TEST(Vorform, ResultsSurviveSevenFurtherAndNestedCalls) {
+    const char* first = vorform("first %d", 1);
+    std::vector<const char*> later;
+    for (int i = 0; i < 7; ++i)
+        later.push_back(vorform("later %d %s", i, std::string(5000, 'z').c_str()));
+    EXPECT_STREQ(first, "first 1");
+    for (int i = 0; i < 7; ++i)
+        EXPECT_EQ(std::string(later[i]).substr(0, 8), "later " + std::to_string(i) + " ");
+    // A result used as the argument of a further call.
+    const char* inner = vorform("%s[%d]", "bus", 3);
+    EXPECT_STREQ(vorform("wire %s;", vorform("\\%s ", inner)), "wire \\bus[3] ;");
+    std::string tail(3000, 't');
+    const char* a = vorform("%s", "abc");
+    EXPECT_EQ(std::string(vorform("%s%s%s", a, tail.c_str(), a)), "abc" + tail + "abc");
+}
+
+TEST(HostString, CompareAndCase) {
+    String s("Clk_Buf");
+    EXPECT_EQ(s.Compare("Clk_Buf"), 0);
+    EXPECT_NE(s.Compare("clk_buf"), 0);
+    EXPECT_EQ(s.Compare("CLK_BUF", String::IgnoreCase), 0);
+    EXPECT_LT(s.Compare("Clk_Bug"), 0);
+    EXPECT_GT(s.Compare("Clk_Bu"), 0);
+    EXPECT_LT(s.Compare("clk_bufx", String::IgnoreCase), 0);
+    EXPECT_GT(s.Compare(nullptr), 0);
+    EXPECT_EQ(String().Compare(nullptr), 0);
+    s.MakeUpper();
+    EXPECT_STREQ(s.c_str(), "CLK_BUF");
+    s.MakeLower();
+    s.SetChar(0, 'C');
+    s.SetChar(100, 'Z');  // out of range: ignored
+    EXPECT_STREQ(s.c_str(), "Clk_buf");
+}
+
+TEST(HostString, GetUINT32ReadsWholeDecimalText) {
+    struct Case {
+        const char* text;
+        uint32_t value;
+        bool ok;
+    };
+    const Case cases[] = {
+        {"0", 0, true},
+        {"007", 7, true},
+        {"4294967295", 4294967295u, true},
+        {"4294967296", 0, false},
+        {"", 0, false},
+        {"12a", 0, false},
+        {" 12", 0, false},
+        {"-1", 0, false},
+        {"+3", 0, false},
+        {"99999999999999999999", 0, false},
+    };
+    for (const Case& c : cases) {
+        bool ok = !c.ok;
+        EXPECT_EQ(String(c.text).GetUINT32(&ok), c.value) << c.text;
+        EXPECT_EQ(ok, c.ok) << c.text;
+    }
+}
+
+TEST(HostString, SplitAtSeparatorsOutsideQuotes) {
+    struct Case {
+        const char* text;
+        const char* seps;
+        bool skipEmpty;
+        const char *open, *close;
+        V pieces;
+    };
+    const Case cases[] = {
+        {"16'h0000", "'", true, "", "", {"16", "h0000"}},
+        {"a::b:", ":", true, nullptr, nullptr, {"a", "b"}},
+        {"a::b:", ":", false, nullptr, nullptr, {"a", "", "b", ""}},
+        {"a b,c", " ,", true, "", "", {"a", "b", "c"}},
+        {"", ":", true, "", "", {}},
+        {"", ":", false, "", "", {""}},
+        {"abc", "", true, "", "", {"abc"}},
+        // The item syntax of the inclusion maps: key:name:name with ' quotes.
+        {"RAMB16:'A:B':C", ":", true, "'", "'", {"RAMB16", "A:B", "C"}},
+        {"'a:b'c:d", ":", true, "'", "'", {"a:bc", "d"}},           // text after the quote stays
+        {"a'b:c'", ":", true, "'", "'", {"a'b", "c'"}},             // a quote inside is text
+        {"k:'open:rest", ":", true, "'", "'", {"k", "open:rest"}},  // unclosed: to the end
+        {"a:'':b", ":", true, "'", "'", {"a", "", "b"}},            // a quoted empty piece stays
+        {"[a b] (c d) e", " ", true, "[(", "])", {"a b", "c d", "e"}},  // paired by position
+    };
+    for (const Case& c : cases) {
+        V got;
+        for (const String& s : String::Split(c.text, c.seps, c.skipEmpty, c.open, c.close))
+            got.push_back(s.str());
+        EXPECT_EQ(got, c.pieces) << c.text;
+    }
+    EXPECT_TRUE(String::Split(nullptr, ":", true, "", "").empty());
+}
+
+}  // namespace
