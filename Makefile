@@ -1,7 +1,7 @@
 # Set-up and test commands. Each installs the Debian packages it needs when
 # they are missing, configures and builds.
 
-PACKAGES := g++ cmake make python3 time libgtest-dev libsimdjson-dev yosys iverilog verilator
+PACKAGES := g++ cmake make python3 time libgtest-dev libsimdjson-dev yosys iverilog verilator nextpnr-ice40 fpga-icestorm opensta
 JOBS ?= 2
 BUILD := build
 BUILD_ASAN := build-asan
