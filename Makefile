@@ -32,7 +32,12 @@ demo: build
 test: deps
 	cmake -S . -B $(BUILD_ASAN) -DCMAKE_BUILD_TYPE=Debug -DNLW_SANITIZE=ON -DNLW_WERROR=$(if $(CI),ON,OFF) >/dev/null
 	cmake --build $(BUILD_ASAN) -j$(JOBS)
-	cd $(BUILD_ASAN) && ASAN_OPTIONS=detect_leaks=1 UBSAN_OPTIONS=print_stacktrace=1 ctest --output-on-failure -j$(JOBS)
+	@cd $(BUILD_ASAN) && { ASAN_OPTIONS=detect_leaks=1 UBSAN_OPTIONS=print_stacktrace=1 \
+	  ctest --output-on-failure -j$(JOBS); echo $$? > ctest.status; } 2>&1 | tee ctest.log; \
+	total=$$(sed -n 's/.* tests failed out of \([0-9]*\).*/\1/p' ctest.log | tail -1); \
+	failed=$$(sed -n 's/.*, \([0-9]*\) tests failed out of .*/\1/p' ctest.log | tail -1); \
+	echo "$$(( $${total:-0} - $${failed:-0} )) passed, $${failed:-0} failed"; \
+	exit $$(cat ctest.status)
 
 bench: build
 	@bash bench/run.sh $(BUILD)
