@@ -54,7 +54,7 @@ if [ -n "$last" ]; then
     IFS=: read -r name cells file <<<"$last"
     measure "qdb2ver $name -tf" "$cells" "$out/net.v" "$build/qdb2ver" -w -verbose -tf "$file" "$out/net.v"
     measure "qdb2ver $name -pf" "$cells" "$out/net.v" "$build/qdb2ver" -w -verbose -pf "$file" "$out/net.v"
-    measure "tessel -sta $name (pcs)" "$cells" "$out/net.v" "$build/tessel" -sta -w -verbose "$file" "$out/net.v"
+    measure "tessel -sta $name (pcs)" "$cells" "$out/net.v" "$build/tessel" -sta -w --verbose "$file" "$out/net.v"
 fi
 if [ "$yosys_too" = "--yosys" ]; then
     for entry in "${designs[@]}"; do
