@@ -93,6 +93,7 @@ private:
     void WriteIOPortDeclarations(Nlw_NlBlock* block);
     void WriteWireDeclarations(Nlw_NlBlock* block);
     void WriteWireAssignments(Nlw_NlBlock* block);
+    void WriteChipwideDrives(Nlw_NlBlock* block);
     void WriteComponentInstantiationStatements(Nlw_NlBlock* block);
     // written: connection lines already begun before the port map (bit-init
     // lines), which the separator rule continues.

@@ -73,4 +73,30 @@ void Nlw_VerilogWriter::WriteWireAssignments(Nlw_NlBlock* block) {
         WriteL(";");
         DownIndent();
     }
+    WriteChipwideDrives(block);
+}
+
+// A net the host brought out as the port of a global signal (marked with
+// "NLW_CHIPWIDE_NET") drives that net of the chipwide module, which every
+// cell model reads. The chipwide net is active high; a global whose
+// network floats at 1 is active low and is inverted.
+void Nlw_VerilogWriter::WriteChipwideDrives(Nlw_NlBlock* block) {
+    Nlw_NetlistWriter* nlw = GetNlw();
+    const Nlw_NlView* view = block->GetView();
+    if (view == nullptr) return;
+    for (Nlw_NlSignal* signal : {view->GetSetReset(), view->GetTristate()}) {
+        if (signal == nullptr || signal->GetParent() != block) continue;
+        const Vdm_Property* target = signal->GetPropertyByName("NLW_CHIPWIDE_NET");
+        if (target == nullptr || target->GetString() == nullptr) continue;
+        const Nlw_NlNetwork* network = signal->GetNetwork();
+        const Vdm_Property* floatVal =
+            network ? network->GetPropertyByName("VL_FLOATVAL") : nullptr;
+        const bool activeLow = floatVal != nullptr && floatVal->GetInt32() == 1;
+        line_ = "assign chipwide.";
+        line_ += target->GetString();
+        line_ += activeLow ? " = ~" : " = ";
+        line_ += nlw->Escape(signal->GetWritableName(), signal->IsBused() ? 1 : 0);
+        line_ += ';';
+        WriteIL(line_.c_str());
+    }
 }

@@ -113,12 +113,15 @@ void Nlw_Verilog::PrintInfoMessage() {
             "The generated Verilog netlist contains Vornix %s simulation primitives and has to "
             "be used with %s simulation library for correct compilation and simulation. \n",
             lib, lib);
-        NLW_MSG().issueInfo(
-            "Setup Simulation - To perform a setup simulation, specify values in the Maximum "
-            "(MAX) field with the following command line modifier:  -SDFMAX\n");
-        NLW_MSG().issueInfo(
-            "Hold Simulation - To perform the most accurate hold simulation, specify values in "
-            "the Minimum (MIN) field with the following command line modifier:  -SDFMIN\n");
+        if (params->GetWriteSetupHoldNotes()) {
+            NLW_MSG().issueInfo(
+                "Setup Simulation - To perform a setup simulation, specify values in the Maximum "
+                "(MAX) field with the following command line modifier:  -SDFMAX\n");
+            NLW_MSG().issueInfo(
+                "Hold Simulation - To perform the most accurate hold simulation, specify values "
+                "in the Minimum (MIN) field with the following command line modifier:  "
+                "-SDFMIN\n");
+        }
         NLW_MSG().issueInfo(
             "For more information on how to pass the SDF switches to the simulator, see your "
             "Simulator tool documentation.\n");

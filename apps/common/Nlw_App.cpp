@@ -3,12 +3,16 @@
 #include <chrono>
 #include <cstdio>
 #include <cstdlib>
+#include <filesystem>
 #include <memory>
 #include <string>
 #include <vector>
 
+#include "Nlw_HostSteps.h"
+#include "Nlw_MessageStyle.h"
 #include "Nlw_Verilog.h"
 #include "framework/Nlw_Util.h"
+#include "model/Nlw_NlBuilder.h"
 #include "port/Port.h"
 #include "port/UT.h"
 #include "reader/Nlw_JsonReader.h"
@@ -76,6 +80,44 @@ std::unique_ptr<Nlw_NlView>& KeptView() {
     return *kept;
 }
 
+// The options that change the model before it is written. False when the
+// design cannot take them (the message is issued).
+bool ApplyModelOptions(const Nlw_CommandLine& cl, Nlw_NlView& view) {
+    const Nlw_Params& params = cl.params;
+    if (params.GetGlobalSetResetPort() &&
+        !Nlw_AddGlobalPort(view, params.GetGlobalSetResetPort(), true))
+        return false;
+    if (params.GetGlobalTristatePort() &&
+        !Nlw_AddGlobalPort(view, params.GetGlobalTristatePort(), false))
+        return false;
+    if (cl.ppBuffers) Nlw_InsertPathPulseBuffers(view);
+    if (const char* speed = params.GetSpeed()) {
+        // The part name reads device-package-speed; -s replaces the speed.
+        const char* part = view.GetPartName();
+        if (part == nullptr) {
+            Port_MsgManData::createObject("NetListWriters")
+                .issueWarning(
+                    "Option '-s': the design names no part, so the pin map has no speed grade; "
+                    "speed grade %s is used for timing only.\n",
+                    speed);
+        } else {
+            std::string name = part;
+            const size_t first = name.find('-');
+            const size_t second =
+                first == std::string::npos ? std::string::npos : name.find('-', first + 1);
+            if (first == std::string::npos)
+                name += "--";
+            else if (second == std::string::npos)
+                name += "-";
+            else
+                name.erase(second + 1);
+            name += speed;
+            Nlw_NlBuilder(&view).SetDevice(name.substr(0, name.find('-')).c_str(), name.c_str());
+        }
+    }
+    return true;
+}
+
 }  // namespace
 
 int Nlw_RunProgram(Nlw_Program program, int argc, const char* const* argv) {
@@ -97,7 +139,8 @@ int Nlw_RunProgram(Nlw_Program program, int argc, const char* const* argv) {
         for (const char* type : kNetlistTypes)
             if (UT_STR::ICompare(cl.helpTopic.c_str(), type) == 0) known = true;
         if (program == Nlw_Program::Tessel && known) {
-            Nlw_Verilog::Help();
+            for (const std::string& line : Nlw_TesselOptionHelp(cl.helpTopic))
+                Port_MsgManData::createObject("NetListWriters").issueStatus("%s", line.c_str());
             return 0;
         }
         Nlw_Verilog help = program == Nlw_Program::Qdb2ver ? Nlw_Verilog() : Nlw_Verilog("tessel");
@@ -115,11 +158,23 @@ int Nlw_RunProgram(Nlw_Program program, int argc, const char* const* argv) {
         msg.issueError("Cannot open log file '%s'.\n", params.GetLogFileName());
         return 2;
     }
-    for (const std::string& option : cl.ignored)
-        msg.issueWarning(
-            "Option '%s' is accepted but has no effect: the design file holds no data for it.\n",
-            option.c_str());
+    Nlw_MessageStyle style(cl.intStyle, cl.debug);
+    if (!cl.wrapLog.empty() && !style.OpenWrapLog(cl.wrapLog.c_str())) {
+        msg.issueError("Cannot open log file '%s'.\n", cl.wrapLog.c_str());
+        return 2;
+    }
+    for (const std::string& warning : cl.ignored) msg.issueWarning("%s", warning.c_str());
 
+    if (const char* dir = params.GetOutputDir()) {
+        // -dir names the folder of the output files; it is made when missing.
+        std::error_code ec;
+        std::filesystem::create_directories(dir, ec);
+        if (ec) {
+            msg.issueError("Cannot make the output directory '%s': %s.\n", dir,
+                           ec.message().c_str());
+            return 2;
+        }
+    }
     params.SetCommandLine(CommandText(program, args).c_str());
     const char* vornix = Port_Env::GetEnv("VORNIX");
     const Port::PathList& roots = Port::VornixPath::GetInstance();
@@ -139,16 +194,21 @@ int Nlw_RunProgram(Nlw_Program program, int argc, const char* const* argv) {
     clock.Trace("Reading the design");
     if (params.GetTopModuleName() && view.GetRootMacro())
         view.GetRootMacro()->GetType()->SetName(view.Intern(params.GetTopModuleName()));
+    if (!ApplyModelOptions(cl, view)) return 2;
 
     Nlw_Verilog writer = program == Nlw_Program::Qdb2ver ? Nlw_Verilog() : Nlw_Verilog("tessel");
     writer.SetParams(&params);
     writer.SetView(&view);
     writer.SetDesign(design.get());
+    writer.SetIsVornixCore(cl.core);
     std::unique_ptr<Ldm_TypeLib> typeLib(Nlw_Prep::LoadInstallationData(writer));
     writer.SetTypeLib(typeLib.get());
     Nlw_Prep::PrepareProperties(writer);
     clock.Trace("Preparing the properties");
+    if (!cl.bramData.empty() && !Nlw_LoadBlockRamData(writer, cl.bramData)) return 2;
+    if (!cl.qcfFile.empty() && !Nlw_CheckQcfFile(view, cl.qcfFile.c_str())) return 2;
     writer.WriteDesign();
+    if (!cl.bramDir.empty()) Nlw_WriteBlockRamFiles(writer, cl.bramDir.c_str());
     clock.Trace("Writing");
 
     int errors =

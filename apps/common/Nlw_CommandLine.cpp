@@ -13,6 +13,7 @@ enum class Arg {
     Value,     // one value, required
     Optional,  // one value when the next word is not an option
     Bool,      // true or false
+    Tagged,    // one value, then optionally the word "tag" and a name
 };
 
 struct Option {
@@ -23,9 +24,10 @@ struct Option {
     std::function<std::string(Nlw_CommandLine&, const std::string&)> apply;
 };
 
-// An option whose data this host does not have: accepted with a warning.
-std::string Ignore(Nlw_CommandLine& cl, const std::string&, const char* name) {
-    cl.ignored.push_back(name);
+// An option that can have no effect here: accepted with its one warning,
+// which says why.
+std::string Ignore(Nlw_CommandLine& cl, const char* name, const char* why) {
+    cl.ignored.push_back(std::string("Option '") + name + "' has no effect: " + why + "\n");
     return "";
 }
 
@@ -58,14 +60,23 @@ bool ParseBool(const std::string& v, bool& out) {
         cl.params.setter(b);                                               \
         return std::string();                                              \
     }
-#define IGNORE(name) [](Nlw_CommandLine& cl, const std::string& v) { return Ignore(cl, v, name); }
+#define IGNORE(name, why) \
+    [](Nlw_CommandLine& cl, const std::string&) { return Ignore(cl, name, why); }
+
+// -fn and -r are opposites: the last one given wins.
+std::string Flatten(Nlw_CommandLine& cl, bool flatten) {
+    cl.params.SetFlatten(flatten);
+    cl.params.SetRetainHierarchy(!flatten);
+    return "";
+}
 
 // Options both programs share, under the names both spell alike.
 std::vector<Option> CommonOptions() {
     return {
         {"-aka", Arg::None, FLAG(cl.params.SetWriteAka(true))},
-        {"-fn", Arg::None, FLAG(cl.params.SetFlatten(true))},
-        {"-gp", Arg::Value, IGNORE("-gp")},
+        {"-fn", Arg::None,
+         [](Nlw_CommandLine& cl, const std::string&) { return Flatten(cl, true); }},
+        {"-gp", Arg::Value, TEXT(SetGlobalSetResetPort)},
         {"-ism", Arg::None, FLAG(cl.params.SetWriteInstantiatedTimcells(true))},
         {"-insert_chipwide", Arg::Bool, BOOL(SetInsert_chipwide)},
         {"-ne", Arg::None, FLAG(cl.params.SetWriteEscapedNames(false))},
@@ -74,10 +85,13 @@ std::vector<Option> CommonOptions() {
         {"-shm", Arg::None, FLAG(cl.params.SetWriteShm(true))},
         {"-ti", Arg::Value, TEXT(SetRootInstanceName)},
         {"-tm", Arg::Value, TEXT(SetTopModuleName)},
-        {"-tp", Arg::Value, IGNORE("-tp")},
+        {"-tp", Arg::Value, TEXT(SetGlobalTristatePort)},
         {"-ul", Arg::None, FLAG(cl.params.SetWriteUseLib(true))},
         {"-w", Arg::None, FLAG(cl.params.SetOutputFileMode(Port::Stream::Replace))},
-        {"--ub", Arg::None, IGNORE("--ub")},
+        {"--ub", Arg::None,
+         IGNORE("--ub",
+                "buses are always written as buses here; the option is accepted so that older "
+                "command lines keep working.")},
     };
 }
 
@@ -88,7 +102,8 @@ std::vector<Option> Qdb2verOptions() {
         {"-cd", Arg::None, FLAG(cl.params.SetWriteCellDefine(true))},
         {"-log", Arg::Value, TEXT(SetLogFileName)},
         {"-quiet", Arg::None, FLAG(cl.quiet = true)},
-        {"-r", Arg::None, FLAG(cl.params.SetRetainHierarchy(true))},
+        {"-r", Arg::None,
+         [](Nlw_CommandLine& cl, const std::string&) { return Flatten(cl, false); }},
         {"-tf", Arg::None, FLAG(cl.params.SetWriteTestFile(true))},
         {"-verbose", Arg::None, FLAG(cl.debug = true)},
     };
@@ -112,6 +127,11 @@ std::vector<Option> TesselOptions() {
              cl.params.SetSimMode(false);
              cl.params.SetStaMode(false);
              cl.params.SetEcnTool(v.c_str());
+             if (UT_STR::ICompare(v.c_str(), "formality") != 0 &&
+                 UT_STR::ICompare(v.c_str(), "conformal") != 0)
+                 cl.ignored.push_back("Equivalence tool '" + v +
+                                      "' is not known (formality, conformal): the assertion file "
+                                      "is written in the conformal form.\n");
              return std::string();
          }},
         {"-sim", Arg::None, SetModeSim},
@@ -127,28 +147,53 @@ std::vector<Option> TesselOptions() {
              return UT_STR::ICompare(v.c_str(), "verilog") == 0 ? std::string()
                                                                 : std::string("expects verilog");
          }},
-        {"-bx", Arg::Value, IGNORE("-bx")},
-        {"-bd", Arg::Value, IGNORE("-bd")},
+        {"-bx", Arg::Value,
+         [](Nlw_CommandLine& cl, const std::string& v) {
+             cl.bramDir = v;
+             return std::string();
+         }},
+        {"-bd", Arg::Tagged,
+         [](Nlw_CommandLine& cl, const std::string& v) {
+             // The value arrives as "file" or "file\ntag".
+             size_t cut = v.find('\n');
+             cl.bramData.push_back(
+                 {v.substr(0, cut), cut == std::string::npos ? "" : v.substr(cut + 1)});
+             return std::string();
+         }},
         {"-dir", Arg::Value, TEXT(SetOutputDir)},
         {"-intstyle", Arg::Value,
          [](Nlw_CommandLine& cl, const std::string& v) {
              if (v != "qde" && v != "qflow" && v != "silent")
                  return std::string("expects qde, qflow or silent");
              cl.params.SetIntStyle(v.c_str());
-             if (v == "silent") cl.quiet = true;
+             cl.intStyle = v;
              return std::string();
          }},
         {"-insert_pp_buffers", Arg::Bool,
          [](Nlw_CommandLine& cl, const std::string& v) {
              bool b;
              if (!ParseBool(v, b)) return std::string("expects true or false");
-             return Ignore(cl, v, "-insert_pp_buffers");
+             cl.ppBuffers = b;
+             return std::string();
          }},
         {"-qdm", Arg::Value, TEXT(SetQdmFileName)},
         {"-mhf", Arg::None, FLAG(cl.params.SetMHFMode(true))},
-        {"-module", Arg::None, IGNORE("-module")},
-        {"-qcf", Arg::Value, IGNORE("-qcf")},
-        {"-s", Arg::Value, IGNORE("-s")},
+        {"-module", Arg::None, FLAG(cl.module = true)},
+        {"-qcf", Arg::Value,
+         [](Nlw_CommandLine& cl, const std::string& v) {
+             cl.qcfFile = v;
+             return std::string();
+         }},
+        {"-s", Arg::Value,
+         [](Nlw_CommandLine& cl, const std::string& v) {
+             // "-s 5" and "-s -5" name the same grade.
+             std::string speed = v[0] == '-' ? v.substr(1) : v;
+             if (speed.empty()) return std::string("expects a speed grade");
+             cl.params.SetSpeed(speed.c_str());
+             return std::string();
+         }},
+        {"-funcells", Arg::None, FLAG(cl.params.SetFuncellMode(true))},
+        {"-core", Arg::None, FLAG(cl.params.SetFuncellMode(true); cl.core = true)},
         {"-sdf_anno", Arg::Bool, BOOL(SetSdfAnnotate)},
         {"-tb", Arg::None, FLAG(cl.params.SetWriteTestFile(true))},
         {"-vcd", Arg::None, FLAG(cl.params.SetWriteVcd(true))},
@@ -156,17 +201,20 @@ std::vector<Option> TesselOptions() {
         {"--cd", Arg::None, FLAG(cl.params.SetWriteCellDefine(true))},
         {"--log", Arg::Value, TEXT(SetLogFileName)},
         {"--quiet", Arg::None, FLAG(cl.quiet = true)},
-        {"--r", Arg::None, FLAG(cl.params.SetRetainHierarchy(true))},
+        {"--r", Arg::None,
+         [](Nlw_CommandLine& cl, const std::string&) { return Flatten(cl, false); }},
         {"--verbose", Arg::None, FLAG(cl.debug = true)},
         {"--debug", Arg::None, FLAG(cl.debug = true)},
-        {"--cleanup", Arg::None, IGNORE("--cleanup")},
-        {"--suh", Arg::Bool,
+        {"--cleanup", Arg::None,
+         IGNORE("--cleanup",
+                "every file is written to a temporary file that is renamed into place or removed "
+                "before the program ends, so no run leaves anything to clean up.")},
+        {"--suh", Arg::Bool, BOOL(SetWriteSetupHoldNotes)},
+        {"--wraplog", Arg::Value,
          [](Nlw_CommandLine& cl, const std::string& v) {
-             bool b;
-             if (!ParseBool(v, b)) return std::string("expects true or false");
-             return Ignore(cl, v, "--suh");
+             cl.wrapLog = v;
+             return std::string();
          }},
-        {"--wraplog", Arg::Value, IGNORE("--wraplog")},
     };
     o.insert(o.end(), own.begin(), own.end());
     return o;
@@ -221,11 +269,18 @@ Nlw_CommandLine Nlw_ParseCommandLine(Nlw_Program program, const std::vector<std:
                 break;
             case Arg::Value:
             case Arg::Bool:
+            case Arg::Tagged:
                 if (i + 1 >= args.size()) {
                     cl.error = "Option '" + w + "' needs a value.";
                     continue;
                 }
                 value = args[++i];
+                if (value.empty()) {
+                    cl.error = "Option '" + w + "' needs a value.";
+                    continue;
+                }
+                if (opt->arg == Arg::Tagged && i + 2 < args.size() && args[i + 1] == "tag")
+                    value += "\n" + args[i + 2], i += 2;
                 break;
             case Arg::Optional:
                 if (i + 1 < args.size() && !LooksLikeOption(args[i + 1])) {
@@ -244,6 +299,18 @@ Nlw_CommandLine Nlw_ParseCommandLine(Nlw_Program program, const std::vector<std:
         if (!problem.empty()) cl.error = "Option '" + w + "' " + problem + ", not '" + value + "'.";
     }
     if (!cl.error.empty() || cl.help || cl.version) return cl;
+    if (cl.intStyle == "silent") cl.quiet = true;
+    // A module for instantiation in a larger design brings no chipwide
+    // module and no test fixture of its own.
+    if (cl.module) {
+        cl.params.SetInsert_chipwide(false);
+        if (cl.params.GetWriteTestFile()) {
+            cl.params.SetWriteTestFile(false);
+            Ignore(cl, "-tb",
+                   "with -module the netlist is a module for a larger design, which brings its "
+                   "own test bench.");
+        }
+    }
     if (files.empty()) {
         cl.error = "No input file name given.";
         return cl;

@@ -17,11 +17,26 @@ struct Nlw_CommandLine {
     bool debug = false;     // --debug or -verbose: debug traces on the console
     bool quiet = false;     // -quiet, -intstyle silent
     // Options accepted but without effect here, in the order given; each
-    // gets one warning naming it.
+    // gets its one warning (the text, which names the option and says why).
     std::vector<std::string> ignored;
+    std::string intStyle = "qde";  // -intstyle: qde, qflow or silent
+    std::string wrapLog;           // --wraplog: a log the messages are appended to
+    bool module = false;           // -module: a module to be instantiated
+    bool core = false;             // -core: modules as black boxes (with -funcells)
+    bool ppBuffers = false;        // -insert_pp_buffers true
+    std::string qcfFile;           // -qcf
+    std::string bramDir;           // -bx
+    struct BramData {
+        std::string file, tag;
+    };
+    std::vector<BramData> bramData;  // -bd file [tag name], in the order given
     // Set when the command line is unusable; the program prints the synopsis.
     std::string error;
 };
+
+// The option list of tessel for one netlist type ("sim", "sta" or "ecn",
+// or their long names), one help line per option; empty for another type.
+std::vector<std::string> Nlw_TesselOptionHelp(const std::string& netlistType);
 
 // Parses args (without the program name). Never fails hard: problems are
 // reported in result.error.

@@ -51,6 +51,9 @@ public:
     NLW_TEXT_PARAM(LogFileName)
     NLW_TEXT_PARAM(OutputDir)  // -dir
     NLW_TEXT_PARAM(IntStyle)
+    // -s: the speed grade, which overrides the part's own; null when not
+    // given.
+    NLW_TEXT_PARAM(Speed)
 
     // Modes.
     NLW_FLAG_PARAM(SimMode, true)
@@ -77,6 +80,8 @@ public:
     NLW_FLAG_PARAM(WriteVcd, false)
     NLW_FLAG_PARAM(Flatten, false)
     NLW_FLAG_PARAM(RetainHierarchy, true)
+    // --suh: the closing notices on setup and hold simulation.
+    NLW_FLAG_PARAM(WriteSetupHoldNotes, true)
 
 #undef NLW_TEXT_PARAM
 #undef NLW_FLAG_PARAM

@@ -171,9 +171,11 @@ private:
                         if (*nb.aka) bus->SetAka(nb.aka);
                     }
                     s = b_.GetSignalBusMember(bus, nn.index);
+                    AddNameFlags(s, m.buses[size_t(nn.bus)].flags);
                 } else {
                     s = b_.AddSignal(root, Named(nn.name));
                     if (*nn.aka) s->SetAka(nn.aka);
+                    AddNameFlags(s, nn.flags);
                 }
                 signal_[r] = s;
             }

@@ -109,7 +109,12 @@ struct NetBus {
     Text name = "";
     int32_t msb = 0, lsb = 0;
     Text aka = "";
+    uint8_t flags = 0;  // NameFlags of the name
 };
+
+// Net attributes that mark a name as one the user knows (the translation
+// file lists such nets).
+enum NameFlags : uint8_t { kNameRecovered = 1, kUserVisible = 2 };
 
 // The name a net of a module gets.
 struct NetName {
@@ -118,6 +123,7 @@ struct NetName {
     Text name = "";     // scalar name
     Text aka = "";      // scalar also-known-as name
     uint32_t rank = 0;  // lower is preferred: class, then file order
+    uint8_t flags = 0;  // scalar NameFlags
 };
 
 // A net of the top module marked as the global set/reset or tristate.
@@ -220,6 +226,7 @@ struct NetEntry {
     int32_t msb = 0, lsb = 0;
     nlw_json::Text aka = "";
     int32_t port = -1;  // the port of the same name
+    uint8_t flags = 0;  // NameFlags
 };
 
 // The work space of naming nets, kept from module to module: a design may
@@ -230,11 +237,13 @@ struct NameCandidate {
     int32_t msb, lsb;
     Text aka;
     uint32_t rank;
+    uint8_t flags;
 };
 struct NameScratch {
     std::vector<NetEntry> entries;
     std::vector<NameCandidate> cands;
     std::vector<Text> portAka;
+    std::vector<uint8_t> portFlags;
     std::vector<uint32_t> rank, winBit;
     std::vector<int32_t> winner, busOf, bitMap;
 };
@@ -339,6 +348,13 @@ Nlw_NlBlock* CreateLeafCell(Nlw_NlBuilder& b, const Module& m, const Cell& c, co
     }
     AddBlockProperties(m, c, &lt, padPinName, leaf);
     return leaf;
+}
+
+// Puts the NameFlags of a net's name on its signal as the properties
+// "NAME_RECOVERED" and "USER_VISIBLE".
+inline void AddNameFlags(Nlw_NlSignal* s, uint8_t flags) {
+    if (flags & kNameRecovered) s->AddProperty(Vdm_Property::NewInt("NAME_RECOVERED", 1));
+    if (flags & kUserVisible) s->AddProperty(Vdm_Property::NewInt("USER_VISIBLE", 1));
 }
 
 // The two builders.

@@ -96,6 +96,7 @@ struct Attrs {
     Text aka = "", pinName = "";
     std::string_view global;
     int64_t setResetConn = 3, tristateConn = 3, floatVal = 0;
+    uint8_t nameFlags = 0;
 };
 
 // The attributes of a named net that the reader uses.
@@ -110,6 +111,10 @@ Attrs ReadNetAttrs(object o, TextPool& pool, const Where& where) {
         } else if (k == "PINNAME" || k == "LOC") {
             if (k == "PINNAME" || !*a.pinName)
                 a.pinName = pool.Keep(ValueText(ReadValue(kv.value, pool, where), pool));
+        } else if (k == "NAME_RECOVERED") {
+            a.nameFlags |= kNameRecovered;
+        } else if (k == "USER_VISIBLE") {
+            a.nameFlags |= kUserVisible;
         } else if (k == "NLW_GLOBAL") {
             a.global = ValueText(ReadValue(kv.value, pool, where), pool);
         } else if (k == "NLW_SETRESET_CONN" || k == "NLW_TRISTATE_CONN" || k == "VL_FLOATVAL") {
@@ -410,6 +415,7 @@ void DigestModule(Design& d, Module& m) {
             ReadRange(no, n.width, where, n.msb, n.lsb);
             Attrs a = ReadNetAttrs(no, d.pool, where);
             n.aka = a.aka;
+            n.flags = a.nameFlags;
             auto pit = m.portIndex.find(kv.key);
             if (pit != m.portIndex.end()) {
                 n.port = static_cast<int32_t>(pit->second);

@@ -62,19 +62,24 @@ void NameNets(Module& m, NameScratch& scratch, TextPool& pool) {
     cands.clear();
     std::vector<Text>& portAka = scratch.portAka;
     portAka.assign(m.ports.size(), "");
+    std::vector<uint8_t>& portFlags = scratch.portFlags;
+    portFlags.assign(m.ports.size(), 0);
     for (const NetEntry& e : entries)
-        if (e.port >= 0) portAka[static_cast<size_t>(e.port)] = e.aka;
+        if (e.port >= 0) {
+            portAka[static_cast<size_t>(e.port)] = e.aka;
+            portFlags[static_cast<size_t>(e.port)] = e.flags;
+        }
     for (size_t k = 0; k < m.ports.size(); ++k) {
         const Port& p = m.ports[k];
-        cands.push_back(
-            {p.name, p.bitFirst, p.width, p.msb, p.lsb, portAka[k], static_cast<uint32_t>(k)});
+        cands.push_back({p.name, p.bitFirst, p.width, p.msb, p.lsb, portAka[k],
+                         static_cast<uint32_t>(k), portFlags[k]});
     }
     for (size_t j = 0; j < entries.size(); ++j) {
         const NetEntry& e = entries[j];
         if (e.port >= 0) continue;
         uint32_t cls = e.hidden ? 2 : 1;
-        cands.push_back(
-            {e.name, e.bitFirst, e.width, e.msb, e.lsb, e.aka, cls * kClassStep + uint32_t(j)});
+        cands.push_back({e.name, e.bitFirst, e.width, e.msb, e.lsb, e.aka,
+                         cls * kClassStep + uint32_t(j), e.flags});
     }
 
     std::vector<uint32_t>& rank = scratch.rank;
@@ -118,7 +123,7 @@ void NameNets(Module& m, NameScratch& scratch, TextPool& pool) {
             int32_t& bus = busOf[static_cast<size_t>(winner[n])];
             if (bus < 0) {
                 bus = static_cast<int32_t>(m.buses.size());
-                m.buses.push_back({cd.name, cd.msb, cd.lsb, cd.aka});
+                m.buses.push_back({cd.name, cd.msb, cd.lsb, cd.aka, cd.flags});
             }
             int32_t i = static_cast<int32_t>(winBit[n]);
             nn.bus = bus;
@@ -126,6 +131,7 @@ void NameNets(Module& m, NameScratch& scratch, TextPool& pool) {
         } else {
             nn.name = cd.name;
             nn.aka = cd.aka;
+            nn.flags = cd.flags;
         }
     }
 }

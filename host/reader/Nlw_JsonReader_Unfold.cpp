@@ -55,9 +55,11 @@ private:
                     if (*nb.aka) bus->SetAka(nb.aka);
                 }
                 f.signals[n] = b_.GetSignalBusMember(bus, nn.index);
+                AddNameFlags(f.signals[n], m.buses[static_cast<size_t>(nn.bus)].flags);
             } else {
                 f.signals[n] = b_.AddSignal(f.block, nn.name);
                 if (*nn.aka) f.signals[n]->SetAka(nn.aka);
+                AddNameFlags(f.signals[n], nn.flags);
             }
         }
         for (const Port& p : m.ports)

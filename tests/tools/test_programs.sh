@@ -54,8 +54,6 @@ expect "existing output without -w: exit 1" 1 "$bin/qdb2ver" "$work/top.json"
 if cmp -s "$work/top.v" "$work/keep.v"; then echo "ok   the existing file is kept"; else echo "FAIL the existing file changed"; fail=1; fi
 expect "existing output with -w: exit 0" 0 "$bin/qdb2ver" -w "$work/top.json"
 expect "unwritable directory: exit 1" 1 "$bin/qdb2ver" "$work/top.json" "$work/no/such/dir/x.v"
-expect "options without data warn but work" 0 "$bin/tessel" -sim -gp GSR -w "$work/top.json" "$work/t.v"
-contains "the warning names the option" "$work/err.txt" "-gp"
 
 expect "flattened netlist: exit 0" 0 "$bin/qdb2ver" -fn -w "$work/top.json" "$work/flat.v"
 if grep -q "module leaf" "$work/flat.v"; then echo "FAIL -fn kept the sub-module"; fail=1; else echo "ok   -fn leaves one module"; fi

@@ -90,11 +90,25 @@ TEST(CommandLine, TesselModesAndFiles) {
     EXPECT_STREQ(ecn.params.GetQdmFileName(), "d.qdm");
 }
 
-TEST(CommandLine, OptionsWithoutDataAreAcceptedAndListed) {
+TEST(CommandLine, TesselHostOptions) {
     Nlw_CommandLine cl = Parse(Nlw_Program::Tessel,
-                               {"-gp", "GSR", "-s", "5", "-qcf", "c.qcf", "--cleanup", "a.json"});
+                               {"-fn", "--r", "-bd", "a.mem", "tag", "u/ram", "-bd", "b.mem", "-s",
+                                "-5", "-gp", "GSR", "-module", "-tb", "--cleanup", "a.json"});
     ASSERT_EQ(cl.error, "");
-    EXPECT_EQ(cl.ignored, (std::vector<std::string>{"-gp", "-s", "-qcf", "--cleanup"}));
+    EXPECT_FALSE(cl.params.GetFlatten());  // the last of -fn and -r wins
+    ASSERT_EQ(cl.bramData.size(), 2u);
+    EXPECT_EQ(cl.bramData[0].file + "|" + cl.bramData[0].tag, "a.mem|u/ram");
+    EXPECT_EQ(cl.bramData[1].file + "|" + cl.bramData[1].tag, "b.mem|");
+    EXPECT_STREQ(cl.params.GetSpeed(), "5");
+    EXPECT_STREQ(cl.params.GetGlobalSetResetPort(), "GSR");
+    // -module: no chipwide module, and the fixture request is refused with
+    // its warning; --cleanup can do nothing and says so.
+    EXPECT_FALSE(cl.params.GetInsert_chipwide());
+    EXPECT_FALSE(cl.params.GetWriteTestFile());
+    ASSERT_EQ(cl.ignored.size(), 2u);
+    EXPECT_NE(cl.ignored[0].find("'--cleanup'"), std::string::npos);
+    EXPECT_NE(cl.ignored[1].find("'-tb'"), std::string::npos);
+    EXPECT_TRUE(Parse(Nlw_Program::Tessel, {"--r", "-fn", "a"}).params.GetFlatten());
 }
 
 TEST(CommandLine, UnusableCommandLines) {
@@ -110,6 +124,8 @@ TEST(CommandLine, UnusableCommandLines) {
         {Nlw_Program::Qdb2ver, {"-sim", "a.json"}},                  // a tessel option
         {Nlw_Program::Tessel, {"-ofmt", "vhdl", "a.json"}},
         {Nlw_Program::Tessel, {"-intstyle", "loud", "a.json"}},
+        {Nlw_Program::Tessel, {"-insert_pp_buffers", "yes", "a.json"}},
+        {Nlw_Program::Tessel, {"-s", "-", "a.json"}},
         {Nlw_Program::Tessel, {"a.json", "b.v", "c"}},  // one word too many
     };
     for (const Case& c : cases) {
