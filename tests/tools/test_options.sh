@@ -10,6 +10,7 @@ work=$(mktemp -d)
 trap 'rm -rf "$work"' EXIT
 fail=0
 cp "$data/opt_ram.mem" "$data/opt_top.qcf" "$work/"
+printf '12\nzz\n' >"$work/bad.mem"
 
 "$src/flow/rtl2json" -part vx100-fg256-5 top "$work/top.json" "$data/opt_top.v" >/dev/null || exit 1
 # The net w carries the attributes that put it into the translation file.
@@ -22,7 +23,8 @@ PY
 
 # program | arguments (the design file last unless given) | check | file | text
 # Checks: has/not FILE TEXT, file FILE, out/noout TEXT (the program's output),
-# warn TEXT (exactly one warning, holding TEXT).
+# warn TEXT (exactly one warning, holding TEXT), fails TEXT (a non-zero exit
+# and a message holding TEXT).
 rows=$(cat <<'ROWS'
 qdb2ver|-10ps|has|top.v|`timescale 1 ns/10 ps
 tessel|--10ps|has|top.v|`timescale 1 ns/10 ps
@@ -74,6 +76,9 @@ tessel|-ofmt verilog|file|top.v|
 tessel|-bx mem|has|mem/ram.mem|01
 tessel|-bd ../opt_ram.mem tag ram|has|top.v|256'h00000000000000000000000000000000000000000000000000000000CDAB0102
 tessel|-bd ../opt_ram.mem tag nosuch|warn||fills no block RAM
+tessel|-bd ../bad.mem|fails||'../bad.mem': line 2: 'zz' is not a hexadecimal word
+tessel|-qcf ../none.qcf|fails||Cannot read QCF file '../none.qcf'
+tessel|-gp clk|fails||already has a port named 'clk'
 tessel|-dir o|file|o/top.v|
 tessel|-intstyle qde|out||Writing Verilog netlist file
 tessel|-intstyle qflow|out||STATUS:NetListWriters - Writing Verilog netlist file
@@ -107,6 +112,7 @@ while IFS='|' read -r prog args check file text; do
     case "$args" in -h*) design="" ;; *) design=top.json ;; esac
     # shellcheck disable=SC2086
     (cd "$dir" && "$bin/$prog" $args $design) >"$dir/out.txt" 2>&1
+    rc=$?
     what="$prog $args: $check $file $text"
     case $check in
     has) grep -qF -- "$text" "$dir/$file" 2>/dev/null ;;
@@ -114,6 +120,7 @@ while IFS='|' read -r prog args check file text; do
     file) [ -s "$dir/$file" ] ;;
     out) grep -qF -- "$text" "$dir/out.txt" ;;
     noout) ! grep -qF -- "$text" "$dir/out.txt" ;;
+    fails) [ $rc != 0 ] && grep -qF -- "$text" "$dir/out.txt" ;;
     warn) [ "$(grep -c WARNING "$dir/out.txt")" = 1 ] && grep WARNING "$dir/out.txt" | grep -qF -- "$text" ;;
     esac
     if [ $? = 0 ]; then echo "ok   $what"; else echo "FAIL $what"; head -20 "$dir/out.txt"; fail=1; fi
