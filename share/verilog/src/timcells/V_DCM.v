@@ -33,49 +33,56 @@ module V_DCM (CLKIN, CLKFB, RST, CLK0, CLK90, CLK180, CLK270, CLK2X, CLK2X180, C
   output CLK0, CLK90, CLK180, CLK270, CLK2X, CLK2X180, CLKDV, CLKFX, LOCKED;
 
   localparam integer LOCK_EDGES = 4;
+  // CLKDV_DIVIDE in thousandths, so that the divided clock counts in
+  // integers (1.5, 2.0, 2.5, ... are exact).
+  localparam integer DV_MILLI = $rtoi(CLKDV_DIVIDE * 1000.0 + 0.5);
 
   reg clkin_half;
   wire clk_in = (CLKIN_DIVIDE_BY_2 == "TRUE") ? clkin_half : CLKIN;
   wire run = RST !== 1'b1;
   wire clk0 = run & clk_in;
 
-  real period, last_rise, dv_next, fx_half;
-  integer rises, dv_edges, fx_count, n;
-  reg locked, clk90, clk2x, clkdv, clkfx;
-  event fx_start;
+  // Times in picoseconds, as integers: the model stays readable by tools
+  // that know no real variables.
+  reg [63:0] period, last_rise;
+  integer rises, dv_milli, dv_next, fx_count, n;
+  reg locked, clk90, clk2x, clkdv, clkfx, fx_start, clk_seen;
 
   initial begin
     clkin_half = 1'b0;
-    period = 0.0;
-    last_rise = 0.0;
+    period = 0;
+    last_rise = 0;
     rises = 0;
     locked = 1'b0;
     clk90 = 1'b0;
     clk2x = 1'b0;
     clkdv = 1'b0;
     clkfx = 1'b0;
+    fx_start = 1'b0;
   end
 
   always @(posedge CLKIN) clkin_half <= ~clkin_half;
 
-  always @(posedge RST) begin
-    rises = 0;
-    locked = 1'b0;
-  end
-
-  // Every edge of the input clock: the period measurement and lock on the
-  // rising ones, then the divided and synthesized clocks, in this order so
-  // that they start on the edge that locks.
-  always @(clk_in)
-    if (run && clk_in === 1'b1) begin
-      if (rises > 0) period = $realtime - last_rise;
-      last_rise = $realtime;
+  // Every edge of the input clock, and RST: the period measurement and
+  // lock on the rising edges, then the divided and synthesized clocks, in
+  // this order so that they start on the edge that locks. The block owns
+  // the lock state, so RST clears it here too.
+  always @(clk_in or RST) begin
+    if (!run) begin
+      rises = 0;
+      locked = 1'b0;
+    end else if (clk_in === 1'b1 && clk_seen !== 1'b1) begin
+      // Rounded to picoseconds on purpose.
+      /* verilator lint_off REALCVT */
+      if (rises > 0) period = $realtime * 1000 - last_rise;
+      last_rise = $realtime * 1000;
+      /* verilator lint_on REALCVT */
       if (rises < LOCK_EDGES) rises = rises + 1;
       if (rises == LOCK_EDGES && !locked) begin
         locked = 1'b1;
         clkdv = 1'b1;
-        dv_edges = 0;
-        dv_next = CLKDV_DIVIDE;
+        dv_milli = 0;
+        dv_next = DV_MILLI;
         fx_count = 0;
       end else if (locked) begin
         divide;
@@ -83,46 +90,46 @@ module V_DCM (CLKIN, CLKFB, RST, CLK0, CLK90, CLK180, CLK270, CLK2X, CLK2X180, C
       // CLKFX_MULTIPLY periods in every CLKFX_DIVIDE input periods,
       // restarted on a rising input edge so that they do not drift.
       if (locked) begin
-        if (fx_count == 0) ->fx_start;
+        if (fx_count == 0) fx_start = ~fx_start;
         fx_count = (fx_count + 1) % CLKFX_DIVIDE;
       end
-    end else if (run && locked) begin
+    end else if (clk_in !== clk_seen && locked) begin
       divide;
     end
+    clk_seen = clk_in;
+  end
 
   // Divided clock: toggles after every CLKDV_DIVIDE input half periods,
   // rounded up to whole half periods.
   task divide;
     begin
-      dv_edges = dv_edges + 1;
-      if (dv_edges >= dv_next) begin
+      dv_milli = dv_milli + 1000;
+      if (dv_milli >= dv_next) begin
         clkdv = ~clkdv;
-        dv_next = dv_next + CLKDV_DIVIDE;
+        dv_next = dv_next + DV_MILLI;
       end
     end
   endtask
 
   // A quarter period behind CLK0.
-  always @(clk0) clk90 <= #(period / 4.0) clk0;
+  always @(clk0) clk90 <= #(period / 4000.0) clk0;
 
   // Twice the input frequency: two pulses per input period.
   always @(posedge clk0)
-    if (period > 0.0) begin
+    if (period > 0) begin
       clk2x = 1'b1;
-      #(period / 4.0) clk2x = 1'b0;
-      #(period / 4.0) clk2x = 1'b1;
-      #(period / 4.0) clk2x = 1'b0;
+      #(period / 4000.0) clk2x = 1'b0;
+      #(period / 4000.0) clk2x = 1'b1;
+      #(period / 4000.0) clk2x = 1'b0;
     end
 
-  always @(fx_start) begin
-    fx_half = period * CLKFX_DIVIDE / (2.0 * CLKFX_MULTIPLY);
+  always @(fx_start)
     for (n = 0; n < CLKFX_MULTIPLY; n = n + 1) begin
       clkfx = 1'b1;
-      #(fx_half) clkfx = 1'b0;
+      #(period * CLKFX_DIVIDE / (2000.0 * CLKFX_MULTIPLY)) clkfx = 1'b0;
       // The last low phase ends with the next start.
-      if (n < CLKFX_MULTIPLY - 1) #(fx_half);
+      if (n < CLKFX_MULTIPLY - 1) #(period * CLKFX_DIVIDE / (2000.0 * CLKFX_MULTIPLY));
     end
-  end
 
   assign CLK0 = clk0;
   assign CLK180 = run & ~clk_in;

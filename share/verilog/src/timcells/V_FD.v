@@ -9,16 +9,27 @@ module V_FD (C, D, Q);
   output Q;
 
   wire gsr = chipwide.GSR;
+  wire hold = gsr === 1'b1;
   reg q_out;
   reg notifier;
 
+  // A timing violation toggles the notifier and, with XON "TRUE", makes the
+  // state unknown: both edges of viol wake the state's block, which tells
+  // them from its other events by the value it saw last. With XON "FALSE"
+  // viol stays unknown and never wakes it.
+  wire viol = (XON == "TRUE") ? notifier : 1'bx;
+  reg viol_seen;
+
   initial q_out = INIT;
 
-  always @(posedge gsr) q_out <= INIT;
-  always @(posedge C) if (gsr !== 1'b1) q_out <= D;
-
-  // A timing violation makes the state unknown when XON is "TRUE".
-  always @(notifier) if (XON == "TRUE") q_out <= 1'bx;
+  // One block owns the state: every event that changes it is an edge in
+  // this list.
+  always @(posedge C or posedge hold or posedge viol or negedge viol)
+    if (viol !== viol_seen) begin
+      viol_seen = viol;
+      q_out <= 1'bx;
+    end else if (hold) q_out <= INIT;
+    else q_out <= D;
 
   assign Q = q_out;
 

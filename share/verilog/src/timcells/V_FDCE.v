@@ -10,22 +10,28 @@ module V_FDCE (C, CE, CLR, D, Q);
   output Q;
 
   wire gsr = chipwide.GSR;
+  // The asynchronous inputs act on their level: clear rises also when GSR
+  // falls while CLR is still 1, and the flop is cleared at once.
+  wire hold = gsr === 1'b1;
+  wire clear = !hold && CLR === 1'b1;
   reg q_out;
   reg notifier;
 
+  // A timing violation toggles the notifier and, with XON "TRUE", makes the
+  // state unknown (see V_FD).
+  wire viol = (XON == "TRUE") ? notifier : 1'bx;
+  reg viol_seen;
+
   initial q_out = INIT;
 
-  // The asynchronous inputs act on their level: when GSR falls while CLR is
-  // still 1 the flop is cleared at once.
-  always @(gsr or CLR)
-    if (gsr === 1'b1) q_out <= INIT;
-    else if (CLR === 1'b1) q_out <= 1'b0;
-
-  always @(posedge C)
-    if (gsr !== 1'b1 && CLR !== 1'b1 && CE === 1'b1) q_out <= D;
-    else if (gsr !== 1'b1 && CLR !== 1'b1 && CE !== 1'b0 && q_out !== D) q_out <= 1'bx;
-
-  always @(notifier) if (XON == "TRUE") q_out <= 1'bx;
+  always @(posedge C or posedge hold or posedge clear or posedge viol or negedge viol)
+    if (viol !== viol_seen) begin
+      viol_seen = viol;
+      q_out <= 1'bx;
+    end else if (hold) q_out <= INIT;
+    else if (clear) q_out <= 1'b0;
+    else if (CE === 1'b1) q_out <= D;
+    else if (CE !== 1'b0 && q_out !== D) q_out <= 1'bx;
 
   assign Q = q_out;
 

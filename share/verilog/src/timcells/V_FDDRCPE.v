@@ -11,26 +11,50 @@ module V_FDDRCPE (C0, C1, CE, CLR, PRE, D0, D1, Q);
   output Q;
 
   wire gsr = chipwide.GSR;
-  wire async = gsr === 1'b1 || CLR === 1'b1 || PRE === 1'b1;
+  // The asynchronous inputs act on their level: clear (preset) rises also
+  // when a stronger one falls while CLR (PRE) is still 1.
+  wire hold = gsr === 1'b1;
+  wire clear = !hold && CLR === 1'b1;
+  wire preset = !hold && !clear && PRE === 1'b1;
   reg q_out;
   reg notifier;
 
+  // A timing violation toggles the notifier and, with XON "TRUE", makes the
+  // state unknown (see V_FD).
+  wire viol = (XON == "TRUE") ? notifier : 1'bx;
+  reg viol_seen;
+
+  // The clocks as the state's block saw them last: it wakes on both edges
+  // of each, so that it knows which one rose.
+  reg c0_seen, c1_seen;
+  reg c0_rose, c1_rose;
+
   initial q_out = INIT;
 
-  always @(gsr or CLR or PRE)
-    if (gsr === 1'b1) q_out <= INIT;
-    else if (CLR === 1'b1) q_out <= 1'b0;
-    else if (PRE === 1'b1) q_out <= 1'b1;
+  always @(posedge C0 or negedge C0 or posedge C1 or negedge C1 or posedge hold or posedge clear or
+           posedge preset or posedge viol or negedge viol) begin
+    c0_rose = C0 === 1'b1 && c0_seen !== 1'b1;
+    c1_rose = C1 === 1'b1 && c1_seen !== 1'b1;
+    c0_seen = C0;
+    c1_seen = C1;
+    if (viol !== viol_seen) begin
+      viol_seen = viol;
+      q_out <= 1'bx;
+    end else if (hold) q_out <= INIT;
+    else if (clear) q_out <= 1'b0;
+    else if (preset) q_out <= 1'b1;
+    else if (c0_rose) q_out <= next(q_out, D0);
+    else if (c1_rose) q_out <= next(q_out, D1);
+  end
 
-  always @(posedge C0)
-    if (!async && CE === 1'b1) q_out <= D0;
-    else if (!async && CE !== 1'b0 && q_out !== D0) q_out <= 1'bx;
-
-  always @(posedge C1)
-    if (!async && CE === 1'b1) q_out <= D1;
-    else if (!async && CE !== 1'b0 && q_out !== D1) q_out <= 1'bx;
-
-  always @(notifier) if (XON == "TRUE") q_out <= 1'bx;
+  // The state after a clock edge with data d; an unknown enable makes it
+  // unknown unless d is the state.
+  function next;
+    input q, d;
+    if (CE === 1'b1) next = d;
+    else if (CE !== 1'b0 && q !== d) next = 1'bx;
+    else next = q;
+  endfunction
 
   assign Q = q_out;
 

@@ -11,16 +11,35 @@ module V_FDDRRSE (C0, C1, CE, R, S, D0, D1, Q);
   output Q;
 
   wire gsr = chipwide.GSR;
+  wire hold = gsr === 1'b1;
   reg q_out;
   reg notifier;
 
+  // A timing violation toggles the notifier and, with XON "TRUE", makes the
+  // state unknown (see V_FD).
+  wire viol = (XON == "TRUE") ? notifier : 1'bx;
+  reg viol_seen;
+
+  // The clocks as the state's block saw them last: it wakes on both edges
+  // of each, so that it knows which one rose.
+  reg c0_seen, c1_seen;
+  reg c0_rose, c1_rose;
+
   initial q_out = INIT;
 
-  always @(posedge gsr) q_out <= INIT;
-  always @(posedge C0) if (gsr !== 1'b1) q_out <= next(q_out, D0);
-  always @(posedge C1) if (gsr !== 1'b1) q_out <= next(q_out, D1);
-
-  always @(notifier) if (XON == "TRUE") q_out <= 1'bx;
+  always @(posedge C0 or negedge C0 or posedge C1 or negedge C1 or posedge hold or posedge viol or
+           negedge viol) begin
+    c0_rose = C0 === 1'b1 && c0_seen !== 1'b1;
+    c1_rose = C1 === 1'b1 && c1_seen !== 1'b1;
+    c0_seen = C0;
+    c1_seen = C1;
+    if (viol !== viol_seen) begin
+      viol_seen = viol;
+      q_out <= 1'bx;
+    end else if (hold) q_out <= INIT;
+    else if (c0_rose) q_out <= next(q_out, D0);
+    else if (c1_rose) q_out <= next(q_out, D1);
+  end
 
   assign Q = q_out;
 

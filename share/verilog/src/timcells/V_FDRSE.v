@@ -11,15 +11,23 @@ module V_FDRSE (C, CE, R, S, D, Q);
   output Q;
 
   wire gsr = chipwide.GSR;
+  wire hold = gsr === 1'b1;
   reg q_out;
   reg notifier;
 
+  // A timing violation toggles the notifier and, with XON "TRUE", makes the
+  // state unknown (see V_FD).
+  wire viol = (XON == "TRUE") ? notifier : 1'bx;
+  reg viol_seen;
+
   initial q_out = INIT;
 
-  always @(posedge gsr) q_out <= INIT;
-  always @(posedge C) if (gsr !== 1'b1) q_out <= next(q_out, D);
-
-  always @(notifier) if (XON == "TRUE") q_out <= 1'bx;
+  always @(posedge C or posedge hold or posedge viol or negedge viol)
+    if (viol !== viol_seen) begin
+      viol_seen = viol;
+      q_out <= 1'bx;
+    end else if (hold) q_out <= INIT;
+    else q_out <= next(q_out, D);
 
   assign Q = q_out;
 

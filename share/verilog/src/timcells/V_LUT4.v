@@ -4,8 +4,15 @@ module V_LUT4 (I0, I1, I2, I3, O);
   parameter [15:0] INIT = 16'h0000;
   input I0, I1, I2, I3;
   output O;
+  reg O;
 
-  assign O = lut(INIT, {I3, I2, I1, I0});
+  // Known inputs index INIT directly; only a select with an unknown bit
+  // takes the careful function. A procedural block, because simulators
+  // evaluate both arms of a conditional operator in a continuous
+  // assignment, which would make every evaluation the slow one.
+  always @(I0 or I1 or I2 or I3)
+    if (^{I3, I2, I1, I0} === 1'bx) O = lut(INIT, {I3, I2, I1, I0});
+    else O = INIT[{I3, I2, I1, I0}];
 
   // Selects input by input, so that an unknown input makes the output
   // unknown only where the entries it chooses between differ.

@@ -24,9 +24,13 @@ module V_RAMB4_S8_BE (CLK, EN, WE, RST, ADDR, DI, DO);
   parameter XON = "TRUE";
   parameter MSGON = "TRUE";
   input CLK, EN, WE, RST;
+  // Declared from index 0 up on purpose (see above), which Verilator's lint
+  // would otherwise question.
+  /* verilator lint_off LITENDIAN */
   input [0:8] ADDR;
   input [0:7] DI;
   output [0:7] DO;
+  /* verilator lint_on LITENDIAN */
 
   // The buses count from 0 up: index i of each bus is the bit of weight
   // 2**i, whatever its position in the declaration.
@@ -72,19 +76,25 @@ module V_RAMB4_S8_BE (CLK, EN, WE, RST, ADDR, DI, DO);
     do_out = 8'h00;
   end
 
-  always @(posedge gsr) do_out <= 8'h00;
+  // One block owns the output register; a timing violation toggles the
+  // notifier and, with XON "TRUE", makes DO unknown (see V_FD).
+  wire hold = gsr === 1'b1;
+  wire viol = (XON == "TRUE") ? notifier : 1'bx;
+  reg viol_seen;
 
-  always @(posedge CLK)
-    if (gsr !== 1'b1 && EN === 1'b1) begin
+  always @(posedge CLK or posedge hold or posedge viol or negedge viol)
+    if (viol !== viol_seen) begin
+      viol_seen = viol;
+      do_out <= 8'hxx;
+    end else if (hold) do_out <= 8'h00;
+    else if (EN === 1'b1) begin
       if (WE === 1'b1) mem[addr] <= di;
       if (RST === 1'b1) do_out <= 8'h00;
       else if (WE === 1'b1) do_out <= di;
       else do_out <= mem[addr];
-    end else if (gsr !== 1'b1 && EN !== 1'b0) begin
+    end else if (EN !== 1'b0) begin
       do_out <= 8'hxx;
     end
-
-  always @(notifier) if (XON == "TRUE") do_out <= 8'hxx;
 
   specify
     (posedge CLK *> (DO +: DI)) = (0, 0);
