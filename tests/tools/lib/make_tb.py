@@ -1,9 +1,11 @@
 #!/usr/bin/env python3
 """Writes a random-stimulus test bench for the top module of a netlist JSON.
 
-usage: make_tb.py DESIGN.json TOP CYCLES SEED > tb.v
+usage: make_tb.py DESIGN.json TOP CYCLES SEED [NAME=VALUE...] > tb.v
 
-The bench instantiates TOP as `uut`, connected by port name. Clock inputs
+The bench instantiates TOP as `uut`, connected by port name, with the
+parameter values given (for an RTL reference whose netlist was made with
+parameter overrides). Clock inputs
 (one-bit inputs named clk, clock or clk_*) run with a 20 ns period; every
 other input takes a new pseudo-random value 5 ns into each cycle, the same
 values in every simulation of the same design. Reset-like inputs (rst, reset,
@@ -46,6 +48,7 @@ def port_range(port):
 
 def main():
     path, top, cycles, seed = sys.argv[1], sys.argv[2], int(sys.argv[3]), int(sys.argv[4])
+    params = [a.split("=", 1) for a in sys.argv[5:]]
     with open(path) as f:
         module = json.load(f)["modules"][top]
     rng = random.Random(seed)
@@ -66,7 +69,8 @@ def main():
             out.append(f"  reg{rng_text} {escape('drive_' + name)};")
             out.append(f"  assign (weak1, weak0) {escape(name)} = {escape('drive_' + name)};")
     conns = ",\n    ".join(f".{escape(n)}({escape(n)})" for n, _ in ports)
-    out.append(f"  {escape(top)} uut (\n    {conns}\n  );")
+    overrides = ", ".join(f".{n}({v})" for n, v in params)
+    out.append(f"  {escape(top)} {'#(' + overrides + ') ' if params else ''}uut (\n    {conns}\n  );")
     out.append("")
     out.append("  initial begin")
     for c in clocks:

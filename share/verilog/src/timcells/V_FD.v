@@ -10,7 +10,7 @@ module V_FD (C, D, Q);
 
   wire gsr = chipwide.GSR;
   wire hold = gsr === 1'b1;
-  reg q_out;
+  reg Q;
   reg notifier;
 
   // A timing violation toggles the notifier and, with XON "TRUE", makes the
@@ -20,18 +20,16 @@ module V_FD (C, D, Q);
   wire viol = (XON == "TRUE") ? notifier : 1'bx;
   reg viol_seen;
 
-  initial q_out = INIT;
+  initial Q = INIT;
 
   // One block owns the state: every event that changes it is an edge in
   // this list.
   always @(posedge C or posedge hold or posedge viol or negedge viol)
     if (viol !== viol_seen) begin
       viol_seen = viol;
-      q_out <= 1'bx;
-    end else if (hold) q_out <= INIT;
-    else q_out <= D;
-
-  assign Q = q_out;
+      Q <= 1'bx;
+    end else if (hold) Q <= INIT;
+    else Q <= D;
 
   specify
     (posedge C => (Q +: D)) = (0, 0);

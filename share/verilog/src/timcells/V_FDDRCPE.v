@@ -16,7 +16,7 @@ module V_FDDRCPE (C0, C1, CE, CLR, PRE, D0, D1, Q);
   wire hold = gsr === 1'b1;
   wire clear = !hold && CLR === 1'b1;
   wire preset = !hold && !clear && PRE === 1'b1;
-  reg q_out;
+  reg Q;
   reg notifier;
 
   // A timing violation toggles the notifier and, with XON "TRUE", makes the
@@ -29,7 +29,7 @@ module V_FDDRCPE (C0, C1, CE, CLR, PRE, D0, D1, Q);
   reg c0_seen, c1_seen;
   reg c0_rose, c1_rose;
 
-  initial q_out = INIT;
+  initial Q = INIT;
 
   always @(posedge C0 or negedge C0 or posedge C1 or negedge C1 or posedge hold or posedge clear or
            posedge preset or posedge viol or negedge viol) begin
@@ -39,12 +39,12 @@ module V_FDDRCPE (C0, C1, CE, CLR, PRE, D0, D1, Q);
     c1_seen = C1;
     if (viol !== viol_seen) begin
       viol_seen = viol;
-      q_out <= 1'bx;
-    end else if (hold) q_out <= INIT;
-    else if (clear) q_out <= 1'b0;
-    else if (preset) q_out <= 1'b1;
-    else if (c0_rose) q_out <= next(q_out, D0);
-    else if (c1_rose) q_out <= next(q_out, D1);
+      Q <= 1'bx;
+    end else if (hold) Q <= INIT;
+    else if (clear) Q <= 1'b0;
+    else if (preset) Q <= 1'b1;
+    else if (c0_rose) Q <= next(Q, D0);
+    else if (c1_rose) Q <= next(Q, D1);
   end
 
   // The state after a clock edge with data d; an unknown enable makes it
@@ -55,8 +55,6 @@ module V_FDDRCPE (C0, C1, CE, CLR, PRE, D0, D1, Q);
     else if (CE !== 1'b0 && q !== d) next = 1'bx;
     else next = q;
   endfunction
-
-  assign Q = q_out;
 
   specify
     (posedge C0 => (Q +: D0)) = (0, 0);

@@ -12,7 +12,7 @@ module V_FDDRRSE (C0, C1, CE, R, S, D0, D1, Q);
 
   wire gsr = chipwide.GSR;
   wire hold = gsr === 1'b1;
-  reg q_out;
+  reg Q;
   reg notifier;
 
   // A timing violation toggles the notifier and, with XON "TRUE", makes the
@@ -25,7 +25,7 @@ module V_FDDRRSE (C0, C1, CE, R, S, D0, D1, Q);
   reg c0_seen, c1_seen;
   reg c0_rose, c1_rose;
 
-  initial q_out = INIT;
+  initial Q = INIT;
 
   always @(posedge C0 or negedge C0 or posedge C1 or negedge C1 or posedge hold or posedge viol or
            negedge viol) begin
@@ -35,13 +35,11 @@ module V_FDDRRSE (C0, C1, CE, R, S, D0, D1, Q);
     c1_seen = C1;
     if (viol !== viol_seen) begin
       viol_seen = viol;
-      q_out <= 1'bx;
-    end else if (hold) q_out <= INIT;
-    else if (c0_rose) q_out <= next(q_out, D0);
-    else if (c1_rose) q_out <= next(q_out, D1);
+      Q <= 1'bx;
+    end else if (hold) Q <= INIT;
+    else if (c0_rose) Q <= next(Q, D0);
+    else if (c1_rose) Q <= next(Q, D1);
   end
-
-  assign Q = q_out;
 
   // The state after a clock edge with data d.
   function next;

@@ -14,7 +14,7 @@ module V_FDPE (C, CE, PRE, D, Q);
   // falls while PRE is still 1, and the flop is preset at once.
   wire hold = gsr === 1'b1;
   wire preset = !hold && PRE === 1'b1;
-  reg q_out;
+  reg Q;
   reg notifier;
 
   // A timing violation toggles the notifier and, with XON "TRUE", makes the
@@ -22,18 +22,16 @@ module V_FDPE (C, CE, PRE, D, Q);
   wire viol = (XON == "TRUE") ? notifier : 1'bx;
   reg viol_seen;
 
-  initial q_out = INIT;
+  initial Q = INIT;
 
   always @(posedge C or posedge hold or posedge preset or posedge viol or negedge viol)
     if (viol !== viol_seen) begin
       viol_seen = viol;
-      q_out <= 1'bx;
-    end else if (hold) q_out <= INIT;
-    else if (preset) q_out <= 1'b1;
-    else if (CE === 1'b1) q_out <= D;
-    else if (CE !== 1'b0 && q_out !== D) q_out <= 1'bx;
-
-  assign Q = q_out;
+      Q <= 1'bx;
+    end else if (hold) Q <= INIT;
+    else if (preset) Q <= 1'b1;
+    else if (CE === 1'b1) Q <= D;
+    else if (CE !== 1'b0 && Q !== D) Q <= 1'bx;
 
   specify
     (posedge C => (Q +: D)) = (0, 0);

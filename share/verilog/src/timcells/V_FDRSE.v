@@ -12,7 +12,7 @@ module V_FDRSE (C, CE, R, S, D, Q);
 
   wire gsr = chipwide.GSR;
   wire hold = gsr === 1'b1;
-  reg q_out;
+  reg Q;
   reg notifier;
 
   // A timing violation toggles the notifier and, with XON "TRUE", makes the
@@ -20,16 +20,14 @@ module V_FDRSE (C, CE, R, S, D, Q);
   wire viol = (XON == "TRUE") ? notifier : 1'bx;
   reg viol_seen;
 
-  initial q_out = INIT;
+  initial Q = INIT;
 
   always @(posedge C or posedge hold or posedge viol or negedge viol)
     if (viol !== viol_seen) begin
       viol_seen = viol;
-      q_out <= 1'bx;
-    end else if (hold) q_out <= INIT;
-    else q_out <= next(q_out, D);
-
-  assign Q = q_out;
+      Q <= 1'bx;
+    end else if (hold) Q <= INIT;
+    else Q <= next(Q, D);
 
   // The state after a clock edge with data d; an unknown control makes it
   // unknown.

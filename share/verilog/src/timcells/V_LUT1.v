@@ -4,34 +4,14 @@ module V_LUT1 (I0, O);
   parameter [1:0] INIT = 2'h0;
   input I0;
   output O;
-  reg O;
 
-  // Known inputs index INIT directly; only a select with an unknown bit
-  // takes the careful function. A procedural block, because simulators
-  // evaluate both arms of a conditional operator in a continuous
-  // assignment, which would make every evaluation the slow one.
-  always @(I0)
-    if (^{I0} === 1'bx) O = lut(INIT, {I0});
-    else O = INIT[{I0}];
-
-  // Selects input by input, so that an unknown input makes the output
-  // unknown only where the entries it chooses between differ.
-  function lut;
-    input [1:0] init;
-    input [0:0] s;
-    reg [1:0] t;
-    integer k;
-    begin
-      t = init;
-      for (k = 0; k < 1; k = k + 1) t[k] = choose(t[2 * k], t[2 * k + 1], s[0]);
-      lut = t[0];
-    end
-  endfunction
-
-  function choose;
-    input a, b, s;
-    choose = (s === 1'b0) ? a : (s === 1'b1) ? b : (a === b) ? a : 1'bx;
-  endfunction
+  // A chain of multiplexers, one input at a time from the highest: each
+  // stage keeps the half of the table its input selects. An unknown input
+  // keeps the bits where both halves agree and makes the others unknown
+  // (the rule of the conditional operator), so an unknown input that does
+  // not matter leaves O known. A change of I0 reevaluates the last stage
+  // only; continuous assignments simulate faster than a procedural block.
+  assign O = I0 ? INIT[1] : INIT[0];
 
   specify
     (I0 => O) = (0, 0);

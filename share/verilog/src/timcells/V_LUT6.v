@@ -4,39 +4,19 @@ module V_LUT6 (I0, I1, I2, I3, I4, I5, O);
   parameter [63:0] INIT = 64'h0000000000000000;
   input I0, I1, I2, I3, I4, I5;
   output O;
-  reg O;
 
-  // Known inputs index INIT directly; only a select with an unknown bit
-  // takes the careful function. A procedural block, because simulators
-  // evaluate both arms of a conditional operator in a continuous
-  // assignment, which would make every evaluation the slow one.
-  always @(I0 or I1 or I2 or I3 or I4 or I5)
-    if (^{I5, I4, I3, I2, I1, I0} === 1'bx) O = lut(INIT, {I5, I4, I3, I2, I1, I0});
-    else O = INIT[{I5, I4, I3, I2, I1, I0}];
-
-  // Selects input by input, so that an unknown input makes the output
-  // unknown only where the entries it chooses between differ.
-  function lut;
-    input [63:0] init;
-    input [5:0] s;
-    reg [63:0] t;
-    integer k;
-    begin
-      t = init;
-      for (k = 0; k < 32; k = k + 1) t[k] = choose(t[2 * k], t[2 * k + 1], s[0]);
-      for (k = 0; k < 16; k = k + 1) t[k] = choose(t[2 * k], t[2 * k + 1], s[1]);
-      for (k = 0; k < 8; k = k + 1) t[k] = choose(t[2 * k], t[2 * k + 1], s[2]);
-      for (k = 0; k < 4; k = k + 1) t[k] = choose(t[2 * k], t[2 * k + 1], s[3]);
-      for (k = 0; k < 2; k = k + 1) t[k] = choose(t[2 * k], t[2 * k + 1], s[4]);
-      for (k = 0; k < 1; k = k + 1) t[k] = choose(t[2 * k], t[2 * k + 1], s[5]);
-      lut = t[0];
-    end
-  endfunction
-
-  function choose;
-    input a, b, s;
-    choose = (s === 1'b0) ? a : (s === 1'b1) ? b : (a === b) ? a : 1'bx;
-  endfunction
+  // A chain of multiplexers, one input at a time from the highest: each
+  // stage keeps the half of the table its input selects. An unknown input
+  // keeps the bits where both halves agree and makes the others unknown
+  // (the rule of the conditional operator), so an unknown input that does
+  // not matter leaves O known. A change of I0 reevaluates the last stage
+  // only; continuous assignments simulate faster than a procedural block.
+  wire [31:0] t5 = I5 ? INIT[63:32] : INIT[31:0];
+  wire [15:0] t4 = I4 ? t5[31:16] : t5[15:0];
+  wire [7:0] t3 = I3 ? t4[15:8] : t4[7:0];
+  wire [3:0] t2 = I2 ? t3[7:4] : t3[3:0];
+  wire [1:0] t1 = I1 ? t2[3:2] : t2[1:0];
+  assign O = I0 ? t1[1] : t1[0];
 
   specify
     (I0 => O) = (0, 0);
