@@ -1,0 +1,45 @@
+#!/usr/bin/env bash
+# Gate-level against RTL simulation time in Icarus Verilog on the CPU-like
+# test design (tests/tools/designs/cpu_bus.v, register file, ALU and bus,
+# with W=8): flow/rtl2json, qdb2ver -ism with the timing models, one
+# random-stimulus bench for both, the best of three runs of each. Prints the
+# CPU seconds of each simulation and their ratio.
+#
+# Usage: bench/sim_ratio.sh [BUILD_DIR] [CYCLES] [INSTALLATION]
+#   INSTALLATION: another installation's models (VORNIX), to compare model
+#   versions; the default is the tree's share/.
+set -euo pipefail
+
+here="$(cd "$(dirname "${BASH_SOURCE[0]}")" && pwd)"
+src="$(cd "$here/.." && pwd)"
+build="${1:-build}"
+cycles="${2:-20000}"
+models="${3:-$src/share}"
+out="$(mktemp -d)"
+trap 'rm -rf "$out"' EXIT
+
+[ -x "$build/qdb2ver" ] || cmake --build "$build" -j2 --target qdb2ver >/dev/null
+design="$src/tests/tools/designs/cpu_bus.v"
+lib="$src/tests/tools/lib"
+
+"$src/flow/rtl2json" -P W=8 cpu_bus "$out/cpu.json" "$design" >/dev/null
+VORNIX="$models" "$build/qdb2ver" -ism -quiet -w "$out/cpu.json" "$out/net.v" >/dev/null
+python3 "$lib/make_tb.py" "$out/cpu.json" cpu_bus "$cycles" 1 >"$out/tb.v"
+python3 "$lib/make_tb.py" "$out/cpu.json" cpu_bus "$cycles" 1 W=8 >"$out/rtl_tb.v"
+iverilog -g2005 -o "$out/rtl.vvp" -s nlw_tb "$out/rtl_tb.v" "$design"
+iverilog -g2005 -o "$out/net.vvp" -s nlw_tb -s chipwide "$out/tb.v" "$out/net.v"
+
+best() {  # vvp file: the least user CPU seconds of three runs
+    local b="" t i
+    for i in 1 2 3; do
+        /usr/bin/time -f "%U" -o "$out/t" vvp -n "$1" >"$out/log.$i"
+        t=$(cat "$out/t")
+        if [ -z "$b" ] || awk -v t="$t" -v b="$b" 'BEGIN { exit !(t < b) }'; then b=$t; fi
+    done
+    echo "$b"
+}
+rtl=$(best "$out/rtl.vvp")
+net=$(best "$out/net.vvp")
+cells=$(grep -c '^  V_' "$out/net.v" || true)
+printf 'cpu_bus W=8, %s cells, %s cycles: RTL %s s, gate level %s s, ratio %s\n' "$cells" "$cycles" \
+    "$rtl" "$net" "$(awk -v r="$rtl" -v n="$net" 'BEGIN { printf "%.1f", (r > 0) ? n / r : 0 }')"
