@@ -16,6 +16,10 @@ endmodule
 V
 printf 'module t(input a, output y);\n  assign y = a +;\nendmodule\n' > syntax.v
 printf 'module t(input a, output y);\n  sub u(.a(a), .y(y));\nendmodule\n' > missing.v
+mkdir -p inc
+printf '`define INV ~\n' > inc/defs.vh
+printf '`include "defs.vh"\nmodule two(input a, output y);\n  leaf u(.a(a), .y(y));\nendmodule\n' > two.v
+printf '`include "defs.vh"\nmodule leaf(input a, output y);\n  assign y = `INV a;\nendmodule\n' > leaf.v
 printf 'clk P1\na[0] P2\ny[3] P3  # the top bit\n' > good.pins
 printf 'clk P1\nclock P2\n' > noport.pins
 printf 'a P1\n' > bus.pins
@@ -27,6 +31,8 @@ printf 'clk P1 extra\n' > words.pins
 cases=(
     "parameter override|0|wrote 'o.json'|-P W=8 -P M=B t o.json t.v"
     "pin constraints|0|wrote 'o.json'|-P W=4 -pins good.pins t o.json t.v"
+    "two files, an include folder|0|wrote 'o.json'|-I inc two o.json two.v leaf.v"
+    "include folder missing|1|cannot find the include file 'defs.vh' (give its folder with -I)|two o.json two.v leaf.v"
     "unknown parameter|1|module 't' has no parameter 'NOPE'|-P NOPE=3 t o.json t.v"
     "bad -P|2|-P takes NAME=VALUE|-P W t o.json t.v"
     "syntax error|1|rtl2json: syntax.v:2: syntax error|t o.json syntax.v"
