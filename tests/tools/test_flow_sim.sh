@@ -4,8 +4,8 @@
 #  1. the cell library agrees with the installation's data files, compiles
 #     with Icarus Verilog and passes Verilator's lint (lib/check_cells.py);
 #     the timing and functional models behave alike (lib/compare_models.py);
-#     the timing models pass directed checks (lib/cells_directed_tb.v);
-#  2. every design under designs/, and the committed example, goes
+#     the timing models pass directed checks (tests/data/cells_directed_tb.v);
+#  2. every design under tests/data/designs/, and the committed example, goes
 #     RTL -> flow/rtl2json -> qdb2ver -ism -> one netlist file that Icarus
 #     compiles on its own; a random-stimulus bench gives the same outputs,
 #     cycle by cycle, on the RTL and on the netlist; Verilator lints the
@@ -97,7 +97,7 @@ else
     show "$work/models.log"
 fi
 if iverilog -g2005 -gspecify -o "$work/directed.vvp" -s cells_directed_tb -s chipwide \
-    -y "$share/verilog/src/timcells" "$lib/cells_directed_tb.v" "$share/verilog/src/chipwide.v" \
+    -y "$share/verilog/src/timcells" "$src/tests/data/cells_directed_tb.v" "$share/verilog/src/chipwide.v" \
     > "$work/directed.log" 2>&1 &&
     vvp -n "$work/directed.vvp" >> "$work/directed.log" 2>&1 &&
     grep -q '^directed: [0-9]* checks, 0 failures' "$work/directed.log"; then
@@ -274,7 +274,7 @@ selected() {
     return 1
 }
 
-for file in "$tools"/designs/*.v; do
+for file in "$src"/tests/data/designs/*.v; do
     name=$(basename "$file" .v)
     selected "$name" || continue
     if [ "$use_yosys_netlist" = 1 ] && has_directive "$file" qdb2ver-only; then
@@ -286,7 +286,7 @@ for file in "$tools"/designs/*.v; do
     read -r -a options <<< "$(directive "$file" flow-options)"
     reference="$file"
     ref=$(directive "$file" reference)
-    [ -n "$ref" ] && reference="$tools/designs/$ref"
+    [ -n "$ref" ] && reference="$src/tests/data/designs/$ref"
     noproof=""
     has_directive "$file" no-proof && noproof=1
     params=()

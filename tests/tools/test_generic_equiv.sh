@@ -35,7 +35,7 @@ lint() {  # netlist top
         "$datdir/simcells.v" "$datdir/simlib.v"
 }
 
-for rtl in "$src"/tests/tools/generic/*.v; do
+for rtl in "$src"/tests/data/generic/*.v; do
     top=$(basename "$rtl" .v)
     for flavour in gates lut4; do
         script="read_verilog $rtl; synth -top $top"

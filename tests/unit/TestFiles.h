@@ -1,4 +1,5 @@
-// Scratch directories and whole-file reads and writes, shared by the tests.
+// Scratch directories, whole-file reads and writes and golden files, shared
+// by the tests.
 #pragma once
 
 #include <gtest/gtest.h>
@@ -6,9 +7,11 @@
 #include <sys/stat.h>
 
 #include <cstdlib>
+#include <filesystem>
 #include <fstream>
 #include <sstream>
 #include <string>
+#include <vector>
 
 namespace nlwtest {
 
@@ -47,6 +50,37 @@ inline std::string ReadFile(const std::string& path) {
 inline bool Exists(const std::string& path) {
     struct stat st;
     return ::stat(path.c_str(), &st) == 0;
+}
+
+// text with every from replaced by to: keeps run-dependent parts (versions,
+// temporary paths) out of golden files.
+inline std::string Replaced(std::string text, const std::string& from, const std::string& to) {
+    for (size_t pos = text.find(from); pos != std::string::npos; pos = text.find(from, pos))
+        text.replace(pos, from.size(), to), pos += to.size();
+    return text;
+}
+
+// Lines (messages, records) as one text, each followed by a newline of its
+// own, so that a message's own line end shows as an empty line.
+inline std::string Joined(const std::vector<std::string>& lines) {
+    std::string text;
+    for (const std::string& line : lines) text += line + "\n";
+    return text;
+}
+
+// Compares text with the golden file tests/data/golden/<name>.txt. With
+// NLW_BLESS=1 in the environment the file is (re)written instead, so that a
+// deliberate change of output is one run plus a review of `git diff`.
+inline void ExpectGolden(const std::string& name, const std::string& text) {
+    const std::string path = std::string(NLW_TEST_DATA_DIR) + "/golden/" + name + ".txt";
+    const char* bless = std::getenv("NLW_BLESS");
+    if (bless && std::string(bless) == "1") {
+        std::filesystem::create_directories(std::filesystem::path(path).parent_path());
+        WriteFile(path, text);
+        return;
+    }
+    ASSERT_TRUE(Exists(path)) << "no golden file " << path << "; write it with NLW_BLESS=1";
+    EXPECT_EQ(text, ReadFile(path)) << "differs from " << path;
 }
 
 }  // namespace nlwtest

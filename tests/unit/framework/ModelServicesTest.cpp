@@ -5,6 +5,7 @@
 #include <string>
 
 #include "HostTestSupport.h"
+#include "TestFiles.h"
 #include "framework/Nlw_Util.h"
 #include "model/Nlw_NlBuilder.h"
 
@@ -134,22 +135,8 @@ TEST(NetlistWriterModel, DumpListsTheNetlist) {
     hosttest::WriteFile(dir / "top.nlw", "an older dump\n");
     QuietCapture capture;
     nlw.WriteNlwFile();
-    EXPECT_EQ(hosttest::ReadFile(dir / "top.nlw"),
-              "# Netlist dump of design demo\n"
-              "# Part: vx100-fg256-5\n"
-              "# Macros: 1\n"
-              "\n"
-              "macro top top parent -\n"
-              "  port a INPUT a\n"
-              "  signal a\n"
-              "  signal n\n"
-              "  instance X_BUF u1\n"
-              "    pin I INPUT a\n"
-              "    pin O OUTPUT n\n"
-              "  instance X_BUF u2\n"
-              "    pin I INPUT n\n"
-              "    pin O OUTPUT -\n"
-              "end\n");
+    nlwtest::ExpectGolden("netlist_writer/dump_lists_the_netlist",
+                          hosttest::ReadFile(dir / "top.nlw"));
     EXPECT_EQ(
         capture.Texts(Port_MsgLevel::Status),
         std::vector<std::string>{"Writing netlist dump file '" + dir / "top.nlw" + "' ...\n"});

@@ -1,10 +1,9 @@
 // The signal/pin map file: header, device lines, one padded line per pad
 // cell with its instance path, and the driver that writes it.
 #include <algorithm>
-#include <fstream>
-#include <sstream>
 
 #include "Nlw_PinWriter.h"
+#include "TestFiles.h"
 #include "VerilogWriterTest.h"
 
 namespace {
@@ -50,19 +49,27 @@ protected:
         EXPECT_TRUE(writer.GetHierarchyPath().empty());
         return writer.GetMemoryText();
     }
-    std::string Header(const std::string& deviceLines) {
-        return std::string("// Vornix signal/pin map file produced by program ") +
-               nlw_.GetApplicationName() + " " + nlw_.GetApplicationVersion() +
-               "\n"
-               "// Date: Thu Jan  1 00:00:00 2026\n"
-               "// Design name: demo\n"
-               "\n" +
-               deviceLines + "\n";
-    }
     // The text after the header.
     static std::string Body(const std::string& text) {
         const size_t pos = text.find("\n\n", text.find("\n\n") + 2);
         return pos == std::string::npos ? text : text.substr(pos + 2);
+    }
+    // A view holding one pad, on an internal net, of a device named device.
+    std::string OnePadOf(const char* device) {
+        Nlw_NlView view;
+        Nlw_NlBuilder b(&view);
+        if (device) b.SetDevice(device, device);
+        nlw_.SetView(&view);
+        Nlw_NlType* pad = b.AddLibraryType("V_IBUF", false, false, NLW_PRIM_PAD);
+        b.AddTypePin(pad, "I", NLW_DIR_INPUT, NLW_PINTYPE_PAD);
+        Nlw_NlBlock* top = b.CreateRoot(b.AddModuleType("top"), "top");
+        Nlw_NlBlock* leaf = b.CreateLeaf(top, pad, "ib");
+        b.Connect(leaf->FindPin("I"), b.AddSignal(top, "n"));
+        leaf->AddProperty(Vdm_Property::NewString("PINNAME", "P1"));
+        Nlw_PinWriter writer(&nlw_, "memory.pin", Port::Stream::Memory);
+        writer.WriteView(&view, 0);
+        nlw_.SetView(&view_);
+        return writer.GetMemoryText();
     }
 
     Nlw_NlType* pad_ = nullptr;
@@ -72,18 +79,10 @@ protected:
 };
 
 TEST_F(PinWriter, WritesHeaderDeviceLinesAndOnePaddedLinePerPad) {
+    Pad(top_, "clk_ibuf", Port(top_, "clk", NLW_DIR_INPUT), "P12");
+    nlwtest::ExpectGolden("pin/no_device", Pins());
     b_.SetDevice("vx100 fg256 -5", "vx100-fg256-5");
-    Pad(top_, "clk_ibuf", Port(top_, "clk", NLW_DIR_INPUT), "P12");
-    EXPECT_EQ(Pins(), Header("// Part 100\n"
-                             "// Package fg256\n"
-                             "// Speed 5\n") +
-                          "clk                 \tINPUT     \tP12       \n");
-}
-
-TEST_F(PinWriter, WithoutDeviceDataNamesThePartOnce) {
-    Pad(top_, "clk_ibuf", Port(top_, "clk", NLW_DIR_INPUT), "P12");
-    EXPECT_EQ(Pins(),
-              Header("// Device: NULL\n") + "clk                 \tINPUT     \tP12       \n");
+    nlwtest::ExpectGolden("pin/device", Pins());
 }
 
 // Pads without a package pin, without a connected pad pin, and cells that
@@ -105,41 +104,19 @@ TEST_F(PinWriter, DesignWithoutAcceptedPadsGivesAnEmptyFile) {
     EXPECT_EQ(writer.GetMemoryText(), "");
 }
 
-TEST_F(PinWriter, FieldsArePaddedButNeverCut) {
-    struct Case {
-        const char* port;
-        const char* pinName;
-        const char* line;
-    };
-    const Case cases[] = {
-        {"d", "A1", "d                   \tINPUT     \tA1        \n"},
-        {"exactly_twenty_chars", "B2", "exactly_twenty_chars\tINPUT     \tB2        \n"},
-        {"a_signal_of_25_characters", "C3", "a_signal_of_25_characters\tINPUT     \tC3        \n"},
-        {"e", "a_long_package_pin", "e                   \tINPUT     \ta_long_package_pin\n"},
-    };
-    for (const Case& c : cases) {
-        SCOPED_TRACE(c.port);
-        Nlw_NlView view;
-        Nlw_NlBuilder b(&view);
-        Nlw_NlType* pad = b.AddLibraryType("V_IBUF", false, false, NLW_PRIM_PAD);
-        b.AddTypePin(pad, "I", NLW_DIR_INPUT, NLW_PINTYPE_PAD);
-        Nlw_NlBlock* top = b.CreateRoot(b.AddModuleType("top"), "top");
-        Nlw_NlSignal* s = b.AddSignal(top, c.port);
-        b.ConnectChild(b.AddPort(top, c.port, NLW_DIR_INPUT), s);
-        Nlw_NlBlock* leaf = b.CreateLeaf(top, pad, "ib");
-        b.Connect(leaf->FindPin("I"), s);
-        leaf->AddProperty(Vdm_Property::NewString("PINNAME", c.pinName));
-        Nlw_PinWriter writer(&nlw_, "memory.pin", Port::Stream::Memory);
-        writer.WriteView(&view, 0);
-        EXPECT_EQ(Body(writer.GetMemoryText()), c.line);
-    }
-}
-
-// The direction written is the pad pin's: an output buffer on a port
-// declared inout is still an output pad.
-TEST_F(PinWriter, DirectionIsThePadPins) {
+// Fields are padded but never cut. The direction written is the pad pin's:
+// an output buffer on a port declared inout is still an output pad. The port
+// found for a signal is remembered: every pad on it gets its line.
+TEST_F(PinWriter, PaddedLinesWithThePadPinsDirection) {
+    Pad(top_, "p0", Port(top_, "d", NLW_DIR_INPUT), "A1");
+    Pad(top_, "p1", Port(top_, "exactly_twenty_chars", NLW_DIR_INPUT), "B2");
+    Pad(top_, "p2", Port(top_, "a_signal_of_25_characters", NLW_DIR_INPUT), "C3");
+    Pad(top_, "p3", Port(top_, "e", NLW_DIR_INPUT), "a_long_package_pin");
     Pad(top_, "ob", Port(top_, "io", NLW_DIR_INOUT), "P3", obuf_);
-    EXPECT_EQ(Body(Pins()), "io                  \tOUTPUT    \tP3        \n");
+    Nlw_NlSignal* s = Port(top_, "bus_in", NLW_DIR_INPUT);
+    Pad(top_, "a", s, "P1");
+    Pad(top_, "b", s, "P2");
+    nlwtest::ExpectGolden("pin/padded_lines", Body(Pins()));
 }
 
 // Lines follow the depth-first walk; every signal name carries the path of
@@ -152,11 +129,7 @@ TEST_F(PinWriter, NestedPadsCarryTheirInstancePath) {
     Nlw_NlBlock* u3 = b_.CreateMacro(top_, b_.AddModuleType("other"), "u3");
     Pad(u3, "ib", Port(u3, "q", NLW_DIR_INPUT), "P22");
     Pad(top_, "ib", Port(top_, "t", NLW_DIR_INPUT), "P23");
-    EXPECT_EQ(Body(Pins()),
-              "u1/u2/din           \tINPUT     \tP20       \n"
-              "u1/m                \tINPUT     \tP21       \n"
-              "u3/q                \tINPUT     \tP22       \n"
-              "t                   \tINPUT     \tP23       \n");
+    nlwtest::ExpectGolden("pin/nested_pads_carry_their_instance_path", Body(Pins()));
 }
 
 // The header comes with the first accepted pad even when its signal reaches
@@ -165,30 +138,8 @@ TEST_F(PinWriter, HeaderIsWrittenOnceFromTheFirstAcceptedPad) {
     Pad(top_, "internal", b_.AddSignal(top_, "n1"), "P5");
     Pad(top_, "ib", Port(top_, "a", NLW_DIR_INPUT), "P6");
     Pad(top_, "internal2", b_.AddSignal(top_, "n2"), "P7");
-    EXPECT_EQ(Pins(),
-              Header("// Device: NULL\n") + "a                   \tINPUT     \tP6        \n");
-
-    Nlw_NlView view;
-    Nlw_NlBuilder b(&view);
-    Nlw_NlType* pad = b.AddLibraryType("V_IBUF", false, false, NLW_PRIM_PAD);
-    b.AddTypePin(pad, "I", NLW_DIR_INPUT, NLW_PINTYPE_PAD);
-    Nlw_NlBlock* top = b.CreateRoot(b.AddModuleType("top"), "top");
-    Nlw_NlBlock* leaf = b.CreateLeaf(top, pad, "ib");
-    b.Connect(leaf->FindPin("I"), b.AddSignal(top, "n"));
-    leaf->AddProperty(Vdm_Property::NewString("PINNAME", "P9"));
-    Nlw_PinWriter writer(&nlw_, "memory.pin", Port::Stream::Memory);
-    writer.WriteView(&view, 0);
-    EXPECT_EQ(writer.GetMemoryText(), Header("// Device: NULL\n"));
-}
-
-// The port found for a signal is remembered: every pad on it gets its line.
-TEST_F(PinWriter, PadsSharingASignalNameTheSamePort) {
-    Nlw_NlSignal* s = Port(top_, "bus_in", NLW_DIR_INPUT);
-    Pad(top_, "a", s, "P1");
-    Pad(top_, "b", s, "P2");
-    EXPECT_EQ(Body(Pins()),
-              "bus_in              \tINPUT     \tP1        \n"
-              "bus_in              \tINPUT     \tP2        \n");
+    nlwtest::ExpectGolden("pin/header_once", Pins());
+    nlwtest::ExpectGolden("pin/internal_pad_only", OnePadOf(nullptr));
 }
 
 TEST(PinWriterDevice, StripsTheFamilyPrefix) {
@@ -202,28 +153,8 @@ TEST(PinWriterDevice, StripsTheFamilyPrefix) {
 }
 
 TEST_F(PinWriter, PartLineShowsTheDeviceWithoutItsPrefix) {
-    const std::pair<const char*, const char*> cases[] = {
-        {"vq9-cs1-2", "// Part q9\n// Package cs1\n// Speed 2\n"},
-        {"ab7-pq2", "// Part ab7\n// Package pq2\n// Speed NULL\n"},
-        {"vx5", "// Part 5\n// Package NULL\n// Speed NULL\n"},
-    };
-    for (const auto& c : cases) {
-        SCOPED_TRACE(c.first);
-        Nlw_NlView view;
-        Nlw_NlBuilder b(&view);
-        b.SetDevice(c.first, c.first);
-        nlw_.SetView(&view);
-        Nlw_NlType* pad = b.AddLibraryType("V_IBUF", false, false, NLW_PRIM_PAD);
-        b.AddTypePin(pad, "I", NLW_DIR_INPUT, NLW_PINTYPE_PAD);
-        Nlw_NlBlock* top = b.CreateRoot(b.AddModuleType("top"), "top");
-        Nlw_NlBlock* leaf = b.CreateLeaf(top, pad, "ib");
-        b.Connect(leaf->FindPin("I"), b.AddSignal(top, "n"));
-        leaf->AddProperty(Vdm_Property::NewString("PINNAME", "P1"));
-        Nlw_PinWriter writer(&nlw_, "memory.pin", Port::Stream::Memory);
-        writer.WriteView(&view, 0);
-        EXPECT_EQ(writer.GetMemoryText(), Header(c.second));
-    }
-    nlw_.SetView(&view_);
+    for (const char* device : {"vq9-cs1-2", "ab7-pq2", "vx5"})
+        nlwtest::ExpectGolden(std::string("pin/part_") + device, OnePadOf(device));
 }
 
 // Hierarchies of any depth: the path grows past any fixed buffer and the
@@ -243,47 +174,21 @@ TEST_F(PinWriter, DeepHierarchyIsWalkedWhole) {
 
 // The driver names the file after the output root, announces it and writes
 // it whole, with the names the legalizer gave.
-TEST(PinWriterFlow, WritesTheRootPinFile) {
+TEST_F(PinWriter, DriverWritesTheRootPinFile) {
     TempDir dir;
-    ScopedEnv stamp("NLW_TIMESTAMP", "Thu Jan  1 00:00:00 2026");
     ScopedEnv noCache("NLW_NO_NAMECACHE", nullptr);
-    Nlw_Verilog nlw;
-    Nlw_Params params;
-    Nlw_NlView view;
-    Nlw_Design design("demo");
-    const std::string output = dir.Path() + "/top.v";
-    params.SetOutputFileName(output.c_str());
-    params.SetOutputFileMode(Port::Stream::Replace);
-    params.SetInputFileType("qdb");
-    params.SetWritePinFile(true);
-    nlw.SetParams(&params);
-    nlw.SetView(&view);
-    nlw.SetDesign(&design);
-
-    Nlw_NlBuilder b(&view);
-    Nlw_NlType* pad = b.AddLibraryType("V_IBUF", false, false, NLW_PRIM_PAD);
-    b.AddTypePin(pad, "I", NLW_DIR_INPUT, NLW_PINTYPE_PAD);
-    Nlw_NlBlock* top = b.CreateRoot(b.AddModuleType("top"), "top");
-    Nlw_NlSignal* s = b.AddSignal(top, "rst");
-    b.ConnectChild(b.AddPort(top, "rst", NLW_DIR_INPUT), s);
-    Nlw_NlBlock* leaf = b.CreateLeaf(top, pad, "ib");
-    b.Connect(leaf->FindPin("I"), s);
-    leaf->AddProperty(Vdm_Property::NewString("PINNAME", "K3"));
-
+    params_.SetOutputFileName((dir.Path() + "/top.v").c_str());
+    params_.SetOutputFileMode(Port::Stream::Replace);
+    params_.SetInputFileType("qdb");
+    params_.SetWritePinFile(true);
+    Pad(top_, "ib", Port(top_, "rst", NLW_DIR_INPUT), "K3");
     Port_MsgCapture capture;
-    nlw.WriteDesign();
+    nlw_.WriteDesign();
     const std::string pinFile = dir.Path() + "/top.pin";
     const std::vector<std::string> status = capture.Texts(Port_MsgLevel::Status);
     EXPECT_NE(std::find(status.begin(), status.end(), "Writing pin file '" + pinFile + "' ...\n"),
               status.end());
-    std::ifstream in(pinFile);
-    std::stringstream text;
-    text << in.rdbuf();
-    EXPECT_NE(text.str().find("\nrst                 \tINPUT     \tK3        \n"),
-              std::string::npos)
-        << text.str();
-    EXPECT_EQ(text.str().rfind("// Vornix signal/pin map file produced by program qdb2ver ", 0),
-              0u);
+    nlwtest::ExpectGolden("pin/driver", nlwtest::ReadFile(pinFile));
 }
 
 }  // namespace

@@ -1,5 +1,6 @@
 // The stock netlist head, the run-parameter block, the closing notices and
 // the output file names.
+#include "TestFiles.h"
 #include "VerilogWriterTest.h"
 #include "framework/Nlw_Writer.h"
 
@@ -30,24 +31,9 @@ public:
     void WriteBlock(Nlw_NlBlock*) override {}
 };
 
-const char* const kSimBlock =
-    "// This verilog netlist is a simulation model and uses simulation \n"
-    "// primitives which may not represent the true implementation of the \n"
-    "// device, however the netlist is functionally correct and should not \n"
-    "// be modified. This file cannot be synthesized and should only be used \n"
-    "// with supported simulation tools.\n"
-    "\n";
-
-const char* const kLibraryBlockStart =
-    "// This verilog netlist is a simulation model and uses library \n"
-    "// primitives which may not represent the true implementation of \n"
-    "// the device, however the netlist is functionally correct and \n"
-    "// should not be modified. This file cannot be synthesized and \n";
-
 const char* const kNoticeStart =
     "If Verilog simulation is performed outside the Atelier environment, please add the "
     "chipwide module to the simulation invocation command. ";
-
 const char* const kNoVornix =
     " The VORNIX environment variable must be set for this program towork. Please check your "
     "environment to ensure that it is setup properly to use the Vornix tools\n";
@@ -55,21 +41,15 @@ const char* const kNoTimcells =
     "Timcell library directory not found, the `uselib constructis omitted for the -ul "
     "option.\n";
 
-class VerilogHeader : public ::testing::Test {
+class VerilogHeader : public vwtest::WriterTest {
 protected:
-    void SetUp() override {
-        nlw.SetParams(&params);
-        nlw.SetView(&view);
-        nlw.SetDesign(&design);
-        top = builder.CreateRoot(builder.AddModuleType("top"), "top");
-    }
+    VerilogHeader() { top = b_.CreateRoot(b_.AddModuleType("top"), "top"); }
 
     std::string Header() {
-        MemoryWriter writer(&nlw);
-        nlw.WriteHeader(&writer);
+        MemoryWriter writer(&nlw_);
+        nlw_.WriteHeader(&writer);
         return writer.GetMemoryText();
     }
-
     size_t Notices(const Port_MsgCapture& capture) {
         size_t count = 0;
         for (const std::string& text : capture.Texts(Port_MsgLevel::Info))
@@ -77,28 +57,17 @@ protected:
         return count;
     }
 
-    Nlw_Verilog nlw;
-    Nlw_Params params;
-    Nlw_NlView view;
-    Nlw_Design design{"demo"};
-    Nlw_NlBuilder builder{&view};
     Nlw_NlBlock* top = nullptr;
 };
 
 TEST_F(VerilogHeader, WritesTheDisclaimerOfTheMode) {
-    EXPECT_EQ(Header(), std::string(kSimBlock) + "`timescale 1 ns/1 ps\n\n");
-
-    params.SetStaMode(true);
-    EXPECT_EQ(Header(), std::string(kLibraryBlockStart) +
-                            "// should only be used with supported static timing analysis "
-                            "tools. \n\n`timescale 1 ns/1 ps\n\n");
-
+    nlwtest::ExpectGolden("header/simulation", Header());
+    params_.SetStaMode(true);
+    nlwtest::ExpectGolden("header/static_timing", Header());
     // Equivalence mode wins over static timing mode.
-    params.SetEcnMode(true);
-    params.SetWritePsTimePrecision(false);
-    EXPECT_EQ(Header(), std::string(kLibraryBlockStart) +
-                            "// should only be used with supported equivalence checking tools. "
-                            "\n\n`timescale 1 ns/10 ps\n\n");
+    params_.SetEcnMode(true);
+    params_.SetWritePsTimePrecision(false);
+    nlwtest::ExpectGolden("header/equivalence", Header());
 }
 
 TEST_F(VerilogHeader, UselibNamesTheFirstRootHoldingTheTimcells) {
@@ -117,40 +86,40 @@ TEST_F(VerilogHeader, UselibNamesTheFirstRootHoldingTheTimcells) {
         {tmp.Path(), "", {kNoTimcells}},  // left out with an error
         {"", "", {kNoVornix, kNoTimcells}},
     };
-    params.SetWriteUseLib(true);
+    const std::string plain = Header();
+    params_.SetWriteUseLib(true);
     for (const Case& c : cases) {
         vwtest::ScopedEnv vornix("VORNIX", c.roots.c_str());
         Port_MsgCapture capture;
-        EXPECT_EQ(Header(), std::string(kSimBlock) + "`timescale 1 ns/1 ps\n" + c.uselib + "\n")
-            << c.roots;
+        EXPECT_EQ(Header(), nlwtest::Replaced(plain, "ps\n", "ps\n" + c.uselib)) << c.roots;
         EXPECT_EQ(capture.Texts(Port_MsgLevel::Error), c.errors) << c.roots;
     }
 }
 
 TEST_F(VerilogHeader, ChipwideIsNeededForUndrivenGlobalsOrTheTopProperty) {
-    EXPECT_FALSE(Peer::IsChipwideNeeded(nlw));
+    EXPECT_FALSE(Peer::IsChipwideNeeded(nlw_));
 
     // A global set/reset that stands for a pin is provided by that pin.
-    Nlw_NlSignal* gsr = builder.AddSignal(top, "GSR");
-    builder.SetSetReset(gsr);
-    Nlw_NlPin* pin = builder.AddPort(top, "GSR_PORT", NLW_DIR_INPUT);
-    builder.SetRefPin(gsr, pin);
-    EXPECT_FALSE(Peer::IsChipwideNeeded(nlw));
+    Nlw_NlSignal* gsr = b_.AddSignal(top, "GSR");
+    b_.SetSetReset(gsr);
+    Nlw_NlPin* pin = b_.AddPort(top, "GSR_PORT", NLW_DIR_INPUT);
+    b_.SetRefPin(gsr, pin);
+    EXPECT_FALSE(Peer::IsChipwideNeeded(nlw_));
 
     // An undriven global tristate without a pin needs the module.
-    Nlw_NlSignal* gts = builder.AddSignal(top, "GTS");
-    builder.SetTristate(gts);
-    EXPECT_TRUE(Peer::IsChipwideNeeded(nlw));
+    Nlw_NlSignal* gts = b_.AddSignal(top, "GTS");
+    b_.SetTristate(gts);
+    EXPECT_TRUE(Peer::IsChipwideNeeded(nlw_));
 
     // Driven, it does not.
-    Nlw_NlType* driverType = builder.AddLibraryType("DRV", true, false);
-    builder.AddTypePin(driverType, "O", NLW_DIR_OUTPUT);
-    Nlw_NlBlock* driver = builder.CreateLeaf(top, driverType, "drv");
-    builder.Connect(driver->GetPin(0), gts);
-    EXPECT_FALSE(Peer::IsChipwideNeeded(nlw));
+    Nlw_NlType* driverType = b_.AddLibraryType("DRV", true, false);
+    b_.AddTypePin(driverType, "O", NLW_DIR_OUTPUT);
+    Nlw_NlBlock* driver = b_.CreateLeaf(top, driverType, "drv");
+    b_.Connect(driver->GetPin(0), gts);
+    EXPECT_FALSE(Peer::IsChipwideNeeded(nlw_));
 
     top->AddProperty(Vdm_Property::NewBool("NLW_CHIPWIDE_MODULE", true));
-    EXPECT_TRUE(Peer::IsChipwideNeeded(nlw));
+    EXPECT_TRUE(Peer::IsChipwideNeeded(nlw_));
 }
 
 TEST_F(VerilogHeader, ChipwideNoticeOncePerHeadAndAtTheEnd) {
@@ -159,79 +128,58 @@ TEST_F(VerilogHeader, ChipwideNoticeOncePerHeadAndAtTheEnd) {
         Port_MsgCapture capture;
         Header();
         Header();
-        Peer::PrintInfoMessage(nlw);
+        Peer::PrintInfoMessage(nlw_);
         EXPECT_EQ(Notices(capture), 3u);
         const std::string last = capture.Texts(Port_MsgLevel::Info).back();
         EXPECT_EQ(last.substr(last.size() - 2), " \n");
         EXPECT_GT(last.size(), std::string(kNoticeStart).size() + 2);
     }
     // With a test fixture the fixture provides the globals.
-    params.SetWriteTestFile(true);
+    params_.SetWriteTestFile(true);
     {
         Port_MsgCapture capture;
         Header();
-        Peer::PrintInfoMessage(nlw);
+        Peer::PrintInfoMessage(nlw_);
         EXPECT_EQ(Notices(capture), 0u);
     }
 }
 
 TEST_F(VerilogHeader, ClosingNoticesNameTheSimulationLibrary) {
-    const std::vector<std::string> rest = {
-        "Setup Simulation - To perform a setup simulation, specify values in the Maximum (MAX) "
-        "field with the following command line modifier:  -SDFMAX\n",
-        "Hold Simulation - To perform the most accurate hold simulation, specify values in the "
-        "Minimum (MIN) field with the following command line modifier:  -SDFMIN\n",
-        "For more information on how to pass the SDF switches to the simulator, see your "
-        "Simulator tool documentation.\n",
-    };
     for (bool funcell : {false, true}) {
-        params.SetFuncellMode(funcell);
-        const char* lib = funcell ? "FUNCELL" : "TIMCELL";
-        std::vector<std::string> expected = {
-            std::string("The generated Verilog netlist contains Vornix ") + lib +
-            " simulation primitives and has to be used with " + lib +
-            " simulation library for correct compilation and simulation. \n"};
-        expected.insert(expected.end(), rest.begin(), rest.end());
+        params_.SetFuncellMode(funcell);
         Port_MsgCapture capture;
-        Peer::PrintInfoMessage(nlw);
-        EXPECT_EQ(capture.Texts(Port_MsgLevel::Info), expected);
+        Peer::PrintInfoMessage(nlw_);
         EXPECT_EQ(capture.msgs.size(), 4u);
+        nlwtest::ExpectGolden(funcell ? "header/closing_funcell" : "header/closing_timcell",
+                              nlwtest::Joined(capture.Texts(Port_MsgLevel::Info)));
     }
 
     // Outside simulation only the chipwide notice can follow.
-    params.SetSimMode(false);
-    params.SetStaMode(true);
+    params_.SetSimMode(false);
+    params_.SetStaMode(true);
     {
         Port_MsgCapture capture;
-        Peer::PrintInfoMessage(nlw);
+        Peer::PrintInfoMessage(nlw_);
         EXPECT_TRUE(capture.msgs.empty());
     }
-    builder.SetSetReset(builder.AddSignal(top, "GSR"));
+    b_.SetSetReset(b_.AddSignal(top, "GSR"));
     {
         Port_MsgCapture capture;
-        Peer::PrintInfoMessage(nlw);
+        Peer::PrintInfoMessage(nlw_);
         ASSERT_EQ(capture.msgs.size(), 1u);
         EXPECT_EQ(Notices(capture), 1u);
     }
 }
 
 TEST_F(VerilogHeader, WriteParamsListsTheRun) {
-    params.SetCommandLine("qdb2ver -w in.qdb out.v");
-    params.SetInputFileName("in.qdb");
-    params.SetOutputFileName("out.v");
-    params.SetVornix("/opt/vx");
-    builder.CreateMacro(top, builder.AddModuleType("sub"), "u1");
-    MemoryWriter writer(&nlw);
-    Peer::WriteParams(nlw, &writer);
-    EXPECT_EQ(writer.GetMemoryText(),
-              "// Command      : qdb2ver -w in.qdb out.v\n"
-              "// Input file   : in.qdb\n"
-              "// Output file  : out.v\n"
-              "// Design name  : demo\n"
-              "// # of Modules : 2\n"
-              "// Vornix       : /opt/vx\n"
-              "// Device       : NULL\n"
-              "\n");
+    params_.SetCommandLine("qdb2ver -w in.qdb out.v");
+    params_.SetInputFileName("in.qdb");
+    params_.SetOutputFileName("out.v");
+    params_.SetVornix("/opt/vx");
+    b_.CreateMacro(top, b_.AddModuleType("sub"), "u1");
+    MemoryWriter writer(&nlw_);
+    Peer::WriteParams(nlw_, &writer);
+    nlwtest::ExpectGolden("header/write_params_lists_the_run", writer.GetMemoryText());
 }
 
 struct NameCase {
@@ -251,27 +199,27 @@ TEST_F(VerilogHeader, FileNamesDeriveFromTheNetlistName) {
         {"/a/b.c/top.v", "/t", "/t/top.sdf", "/t/", "/a/b.c/"},
     };
     for (const NameCase& c : cases) {
-        params.SetOutputFileName(c.output);
-        params.SetSdfPath(c.sdfPath);
-        EXPECT_EQ(Peer::SdfFileName(nlw), c.sdf) << c.output;
-        EXPECT_EQ(Peer::SdfMHPrefix(nlw), c.sdfPrefix) << c.output;
-        EXPECT_EQ(Peer::Directory(nlw), c.directory) << c.output;
+        params_.SetOutputFileName(c.output);
+        params_.SetSdfPath(c.sdfPath);
+        EXPECT_EQ(Peer::SdfFileName(nlw_), c.sdf) << c.output;
+        EXPECT_EQ(Peer::SdfMHPrefix(nlw_), c.sdfPrefix) << c.output;
+        EXPECT_EQ(Peer::Directory(nlw_), c.directory) << c.output;
     }
 
-    params.SetOutputFileName("out/top.v");
-    EXPECT_EQ(Peer::RootFileName(nlw, ".pin"), "out/top.pin");
-    EXPECT_EQ(Peer::RootFileName(nlw, "_mhf_info.txt"), "out/top_mhf_info.txt");
-    EXPECT_EQ(Peer::RootFileName(nlw, "_ism.v"), "out/top_ism.v");
+    params_.SetOutputFileName("out/top.v");
+    EXPECT_EQ(Peer::RootFileName(nlw_, ".pin"), "out/top.pin");
+    EXPECT_EQ(Peer::RootFileName(nlw_, "_mhf_info.txt"), "out/top_mhf_info.txt");
+    EXPECT_EQ(Peer::RootFileName(nlw_, "_ism.v"), "out/top_ism.v");
 
-    params.SetEcnTool("Formality");
-    EXPECT_EQ(Peer::AssertionFileName(nlw), "out/top.svf");
-    params.SetEcnTool("conformal");
-    EXPECT_EQ(Peer::AssertionFileName(nlw), "out/top.vxc");
+    params_.SetEcnTool("Formality");
+    EXPECT_EQ(Peer::AssertionFileName(nlw_), "out/top.svf");
+    params_.SetEcnTool("conformal");
+    EXPECT_EQ(Peer::AssertionFileName(nlw_), "out/top.vxc");
 
     // Names of any length are formed whole.
     const std::string longDir(1500, 'd');
-    params.SetOutputFileName((longDir + "/top.v").c_str());
-    EXPECT_EQ(Peer::RootFileName(nlw, ".pin"), longDir + "/top.pin");
+    params_.SetOutputFileName((longDir + "/top.v").c_str());
+    EXPECT_EQ(Peer::RootFileName(nlw_, ".pin"), longDir + "/top.pin");
 }
 
 }  // namespace

@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "Nlw_VerilogTestWriter.h"
+#include "TestFiles.h"
 #include "VerilogWriterTest.h"
 
 namespace {
@@ -85,73 +86,8 @@ TEST_F(VerilogTestWriter, WholeFileOfASmallDesign) {
     b_.AddPort(top_, "q", NLW_DIR_OUTPUT);
     b_.AddPortBus(top_, "cnt", NLW_DIR_OUTPUT, 8, 0);
     Global("GSR", true, 3, 0);
-
-    EXPECT_EQ(File(),
-              "////////////////////////////////////////////////////////////////////////////////\n"
-              "// Copyright (c) Vornix. All rights reserved.\n"
-              "////////////////////////////////////////////////////////////////////////////////\n"
-              "//\n"
-              "//       | |\n"
-              "//    +------+    Vendor: Vornix\n"
-              "//  --|      |--  Version: 0.1\n"
-              "//  --|  VX  |--  Application: qdb2ver\n"
-              "//  --|      |--  Timestamp: Thu Jan  1 00:00:00 2026\n"
-              "//    +------+\n"
-              "//       | |\n"
-              "//\n"
-              "//             \n"
-              "// Command: qdb2ver -tf top.json\n"
-              "// Design Name: demo\n"
-              "//             \n"
-              "// Purpose:    \n"
-              "//     Vornix TestFixture Template produced by program qdb2ver 0.1\n"
-              "//             \n"
-              "//     ATTENTION: This file was created by qdb2ver and may therefore be \n"
-              "//     overwritten by subsequent runs of qdb2ver. Vornix recommends that you \n"
-              "//     copy this file to a new name, or 'paste' this text into another file, \n"
-              "//     to avoid accidental loss of data.\n"
-              "//             \n"
-              "////////////////////////////////////////////////////////////////////////////////\n"
-              "\n"
-              "`include \"" +
-                  chipwide +
-                  "\"\n"
-                  "`timescale 1 ns/1 ps\n"
-                  "\n"
-                  "  module test;\n"
-                  "    reg clk;\n"
-                  "    wire q;\n"
-                  "    reg [7 : 0] d;\n"
-                  "    wire [8 : 0] cnt;\n"
-                  "    reg GSR;\n"
-                  "    assign chipwide.GSR = GSR;\n"
-                  "    top uut (\n"
-                  "      .clk (clk),\n"
-                  "      .q (q),\n"
-                  "      .d (d),\n"
-                  "      .cnt (cnt)\n"
-                  "    );\n"
-                  "    initial begin\n"
-                  "      $display(\"           T cqd c  \");\n"
-                  "      $display(\"           i l [ n  \");\n"
-                  "      $display(\"           m k 7 t  \");\n"
-                  "      $display(\"           e     [  \");\n"
-                  "      $display(\"               : 8  \");\n"
-                  "      $display(\"                    \");\n"
-                  "      $display(\"               0 :  \");\n"
-                  "      $display(\"               ]    \");\n"
-                  "      $display(\"                 0  \");\n"
-                  "      $display(\"                 ]  \");\n"
-                  "      $monitor(\"%t\",$realtime,,clk,q,\"%h\",d,\"%h\",cnt);\n"
-                  "    end\n"
-                  "    initial begin\n"
-                  "        GSR = 1;\n"
-                  "      #100\n"
-                  "        GSR = 0;\n"
-                  "      #1000 $stop;\n"
-                  "      // #1000 $finish;\n"
-                  "    end\n"
-                  "  endmodule\n");
+    nlwtest::ExpectGolden("testfixture/small_design",
+                          nlwtest::Replaced(File(), chipwide, "<root>/verilog/src/chipwide.v"));
 }
 
 // ---------------------------------------------------------------------------
@@ -228,16 +164,8 @@ TEST_F(VerilogTestWriter, InputsAreRegistersAndEverythingElseWires) {
     b_.SetValid(b_.AddPortBus(top_, "gone", NLW_DIR_INPUT, 1, 0), false);
     b_.AddPort(top_, "a b", NLW_DIR_INPUT);
     const std::string text = Fixture();
-    EXPECT_EQ(text.substr(0, text.find("    top ")),
-              "  module test;\n"
-              "    reg i;\n"
-              "    wire o;\n"
-              "    wire io;\n"
-              "    wire u;\n"
-              "    reg \\a b ;\n"
-              "    reg [3 : 0] bi;\n"
-              "    wire [0 : 3] bo;\n"
-              "    wire [1 : 0] bio;\n");
+    nlwtest::ExpectGolden("testfixture/inputs_are_registers_and_everything_else_wires",
+                          text.substr(0, text.find("    top ")));
 }
 
 TEST_F(VerilogTestWriter, OnlyGlobalsReachedThroughChipwideGetARegister) {
@@ -267,26 +195,11 @@ TEST_F(VerilogTestWriter, OnlyGlobalsReachedThroughChipwideGetARegister) {
 
 TEST_F(VerilogTestWriter, UnitUnderTestNameAndPortMaps) {
     Root();
-    {
-        // No ports: still the opening line, an empty line and the closing.
-        const std::string text = Fixture();
-        EXPECT_NE(text.find("  module test;\n    top uut (\n\n    );\n    initial begin\n"),
-                  std::string::npos)
-            << text;
-        EXPECT_EQ(HeaderRows(), (std::vector<std::string>{"           T ", "           i ",
-                                                          "           m ", "           e "}));
-        EXPECT_EQ(MonitorLine(), "$monitor(\"%t\",$realtime,,);");
-    }
+    nlwtest::ExpectGolden("testfixture/no_ports", Fixture());
     b_.AddPortBus(top_, "d", NLW_DIR_INPUT, 1, 0);
     b_.AddPort(top_, "a-b", NLW_DIR_OUTPUT);
     params_.SetRootInstanceName("dut 1");
-    const std::string text = Fixture();
-    EXPECT_NE(text.find("    top \\dut 1  (\n"
-                        "      .\\a-b  (\\a-b ),\n"
-                        "      .d (d)\n"
-                        "    );\n"),
-              std::string::npos)
-        << text;
+    nlwtest::ExpectGolden("testfixture/escaped_ports", Fixture());
 }
 
 // ---------------------------------------------------------------------------
@@ -295,30 +208,10 @@ TEST_F(VerilogTestWriter, UnitUnderTestNameAndPortMaps) {
 TEST_F(VerilogTestWriter, DumpBlocksFollowTheOptionsShmFirst) {
     Root();
     params_.SetOutputFileName("out/top.v");
-    const std::string shm =
-        "    initial begin\n"
-        "      $timeformat(-9,3,\"ns\",12);\n"
-        "      $shm_open(\"out/top.shm\");\n"
-        "      $shm_probe(\"AS\");\n"
-        "    end\n";
-    const std::string vcd =
-        "    initial begin\n"
-        "      $timeformat(-9,3,\"ns\",12);\n"
-        "      $dumpfile(\"out/top.vcd\");\n"
-        "      $dumpvars(0, test);\n"
-        "    end\n";
-    const std::string uutEnd = "    );\n";
-    const std::string display = "    initial begin\n      $display(";
-    struct Case {
-        bool shm, vcd;
-        std::string blocks;
-    };
-    for (const Case& c : {Case{false, false, ""}, Case{true, false, shm}, Case{false, true, vcd},
-                          Case{true, true, shm + vcd}}) {
-        SCOPED_TRACE(c.blocks);
-        params_.SetWriteShm(c.shm);
-        params_.SetWriteVcd(c.vcd);
-        EXPECT_NE(Fixture().find(uutEnd + c.blocks + display), std::string::npos);
+    for (int dumps = 0; dumps < 4; ++dumps) {
+        params_.SetWriteShm(dumps & 1);
+        params_.SetWriteVcd(dumps & 2);
+        nlwtest::ExpectGolden("testfixture/dumps_" + std::to_string(dumps), Fixture());
     }
 }
 
@@ -352,78 +245,24 @@ TEST_F(VerilogTestWriter, BusColumnsAreTheHexDigitsOfTheBus) {
     }
 }
 
-TEST_F(VerilogTestWriter, RowsUnderABusArePaddedByItsWidth) {
-    struct Case {
-        int msb;
-        std::vector<std::string> rows;
-    };
-    // 8 bits take two columns, 9 bits three, also in the rows below the
-    // bus's label: the next bus stands right of them in every row.
-    const Case cases[] = {
-        {7,
-         {"           T ad e", "           i b[ [", "           m c7 0", "           e d   ",
-          "             e: :", "             f   ", "             g0 0", "             h] ]",
-          "             i   ", "             j   "}},
-        {8,
-         {"           T ad  e", "           i b[  [", "           m c8  0", "           e d    ",
-          "             e:  :", "             f    ", "             g0  0", "             h]  ]",
-          "             i    ", "             j    "}},
-    };
-    for (const Case& c : cases) {
-        SCOPED_TRACE(c.msb);
-        Nlw_NlView view;
-        Nlw_NlBuilder b(&view);
-        top_ = b.CreateRoot(b.AddModuleType("top"), "top");
-        b.AddPortBus(top_, "d", NLW_DIR_INPUT, c.msb, 0);
-        b.AddPortBus(top_, "e", NLW_DIR_OUTPUT, 0, 0);
-        b.AddPort(top_, "abcdefghij", NLW_DIR_OUTPUT);
-        EXPECT_EQ(HeaderRows(), c.rows);
-        EXPECT_EQ(MonitorLine(), "$monitor(\"%t\",$realtime,,abcdefghij,\"%h\",d,\"%h\",e);");
-    }
-}
-
-TEST_F(VerilogTestWriter, LongerLaterNamesStartRowsAlignedWithEarlierColumns) {
+// 8 bits take two columns, 9 bits three, also in the rows below the bus's
+// label: the next column stands right of them in every row. Later, longer
+// names start rows aligned with the earlier columns. A backslash or quote is
+// escaped in the string literal and a percent sign doubled, so that each
+// prints as the one character of the name.
+TEST_F(VerilogTestWriter, ColumnHeaderAndMonitor) {
     Root();
+    b_.AddPortBus(top_, "d", NLW_DIR_INPUT, 7, 0);
+    b_.AddPortBus(top_, "e", NLW_DIR_INPUT, 8, 0);
+    b_.AddPortBus(top_, "f", NLW_DIR_OUTPUT, 0, 0);
+    b_.AddPort(top_, "abcdefghij", NLW_DIR_OUTPUT);
     b_.AddPort(top_, "a", NLW_DIR_INPUT);
     b_.AddPort(top_, "bb", NLW_DIR_INPUT);
     b_.AddPort(top_, "longer", NLW_DIR_OUTPUT);
     b_.AddPort(top_, "c", NLW_DIR_OUTPUT);
-    EXPECT_EQ(HeaderRows(), (std::vector<std::string>{
-                                "           T ablc",
-                                "           i  bo ",
-                                "           m   n ",
-                                "           e   g ",
-                                "               e ",
-                                "               r ",
-                            }));
-}
-
-TEST_F(VerilogTestWriter, LabelCharactersPrintAsThemselves) {
-    struct Case {
-        const char* name;
-        std::vector<std::string> labelRows;  // the column of the label in rows 0 to 3
-    };
-    // A backslash or quote is escaped in the string literal and a percent
-    // sign doubled, so that each prints as the one character of the name.
-    const Case cases[] = {
-        {"\\a\\b ", {"\\\\", "a", "\\\\", "b", " "}},
-        {"\\q\"%r ", {"\\\\", "q", "\\\"", "%%", "r", " "}},
-        {"x", {"x", " ", " ", " "}},
-    };
-    for (const Case& c : cases) {
-        SCOPED_TRACE(c.name);
-        Nlw_NlView view;
-        Nlw_NlBuilder b(&view);
-        top_ = b.CreateRoot(b.AddModuleType("top"), "top");
-        b.AddPort(top_, c.name, NLW_DIR_INPUT);
-        const std::vector<std::string> rows = HeaderRows();
-        ASSERT_EQ(rows.size(), c.labelRows.size());
-        for (size_t j = 0; j < rows.size(); ++j) {
-            const std::string time =
-                j < 4 ? std::string(11, ' ') + "Time"[j] + ' ' : std::string(13, ' ');
-            EXPECT_EQ(rows[j], time + c.labelRows[j]) << j;
-        }
-    }
+    b_.AddPort(top_, "\\a\\b ", NLW_DIR_INPUT);
+    b_.AddPort(top_, "\\q\"%r ", NLW_DIR_INPUT);
+    nlwtest::ExpectGolden("testfixture/column_header", Fixture());
 }
 
 TEST_F(VerilogTestWriter, NamesLongerThanTheGridKeepTheirFirstCharacters) {
@@ -445,49 +284,30 @@ TEST_F(VerilogTestWriter, NamesLongerThanTheGridKeepTheirFirstCharacters) {
 // Stimulus
 
 TEST_F(VerilogTestWriter, StimulusDrivesTheGlobalsByConnection) {
-    const std::string head = "    initial begin\n";
-    const std::string tail =
-        "      #1000 $stop;\n"
-        "      // #1000 $finish;\n"
-        "    end\n";
     struct Global {
         bool present;
         int conn, floatVal;
         bool refPin;
     };
     struct Case {
-        const char* what;
+        const char* name;
         Global setReset, tristate;
-        std::string body;
     };
     const Global none{false, 0, 0, false};
     const Case cases[] = {
-        {"no globals", none, none, ""},
-        {"set/reset through chipwide",
-         {true, 3, 0, false},
-         none,
-         "        GSR = 1;\n      #100\n        GSR = 0;\n"},
-        {"set/reset floating high",
-         {true, 3, 1, false},
-         none,
-         "        GSR = 0;\n      #100\n        GSR = 1;\n"},
-        {"set/reset with connection 1", {true, 1, 0, true}, none, "      #100\n"},
-        {"set/reset floating -1", {true, 3, -1, false}, none, "      #100\n"},
-        {"set/reset through its port",
-         {true, 0, 1, true},
-         none,
-         "        rst_n = 0;\n      #100\n        rst_n = 1;\n"},
-        {"set/reset connection 2 without a port", {true, 2, 0, false}, none, "      #100\n"},
-        {"tristate through its port", none, {true, 2, 1, true}, "        ts = 1;\n"},
-        {"tristate through chipwide", none, {true, 3, 0, false}, "        GTS = 0;\n"},
-        {"tristate floating -1", none, {true, 3, -1, false}, ""},
-        {"both",
-         {true, 3, 0, false},
-         {true, 3, 1, false},
-         "        GSR = 1;\n        GTS = 1;\n      #100\n        GSR = 0;\n"},
+        {"none", none, none},
+        {"gsr_chipwide", {true, 3, 0, false}, none},
+        {"gsr_float_high", {true, 3, 1, false}, none},
+        {"gsr_conn1", {true, 1, 0, true}, none},
+        {"gsr_float_minus1", {true, 3, -1, false}, none},
+        {"gsr_port", {true, 0, 1, true}, none},
+        {"gsr_conn2_no_port", {true, 2, 0, false}, none},
+        {"gts_port", none, {true, 2, 1, true}},
+        {"gts_chipwide", none, {true, 3, 0, false}},
+        {"gts_float_minus1", none, {true, 3, -1, false}},
+        {"both", {true, 3, 0, false}, {true, 3, 1, false}},
     };
     for (const Case& c : cases) {
-        SCOPED_TRACE(c.what);
         Nlw_NlView view;
         Nlw_NlBuilder b(&view);
         top_ = b.CreateRoot(b.AddModuleType("top"), "top");
@@ -511,7 +331,7 @@ TEST_F(VerilogTestWriter, StimulusDrivesTheGlobalsByConnection) {
                 b.SetRefPin(s, pin);
             }
         }
-        EXPECT_EQ(Stimulus(), head + c.body + tail);
+        nlwtest::ExpectGolden(std::string("testfixture/stimulus_") + c.name, Stimulus());
     }
 }
 

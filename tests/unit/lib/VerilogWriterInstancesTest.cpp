@@ -1,4 +1,5 @@
 // Instance statements and port maps.
+#include "TestFiles.h"
 #include "VerilogWriterTest.h"
 
 namespace {
@@ -63,17 +64,7 @@ TEST_F(VerilogWriterInstances, PortMapConnectsScalarsThenBuses) {
     // Nothing on A and D: the scalar is left out, the bus bits float.
     Nlw_NlBlock* u2 = b_.CreateLeaf(top_, cell, "u/2");
     b_.Connect(u2->FindPin("Y"), b_.AddSignal(top_, "n-y"));
-    EXPECT_EQ(Instances(), R"(  V_CELL   u1 (
-    .A(net_a),
-    .B(1'b0),
-    .Y(net_y),
-    .D({net_d[1], 1'b1})
-  );
-  V_CELL   \u/2  (
-    .Y(\n-y ),
-    .D({1'bz, 1'bz})
-  );
-)");
+    nlwtest::ExpectGolden("instances/port_map_connects_scalars_then_buses", Instances());
 }
 
 TEST_F(VerilogWriterInstances, NotInstantiatableChildWritesNothing) {
@@ -90,15 +81,7 @@ TEST_F(VerilogWriterInstances, BitInitDrivesInputsLastCharacterFirst) {
     b_.Connect(u->FindPin("Y"), b_.AddSignal(top_, "y"));
     params_.SetWriteAka(true);
     u->SetAka("orig_u");
-    EXPECT_EQ(Instances(), R"(  V_CELL   u ( // AKA:orig_u
-    .I0(1'b0),
-    .I1(1'b1),
-    .I2(1'b1),
-    .I3(1'b0),
-    .Y(y),
-    .D({1'bz, 1'bz})
-  );
-)");
+    nlwtest::ExpectGolden("instances/bit_init_drives_inputs_last_character_first", Instances());
 }
 
 // Without any port connection after them the bit-init lines must not end
@@ -109,11 +92,7 @@ TEST_F(VerilogWriterInstances, BitInitWithoutConnectionsEndsWithoutComma) {
     b_.AddTypePin(lut, "I1", NLW_DIR_INPUT);
     Nlw_NlBlock* u = b_.CreateLeaf(top_, lut, "u");
     u->AddProperty(Vdm_Property::NewString("NLW_BIT_INIT", "10"));
-    EXPECT_EQ(Instances(), R"(  V_LUT2   u (
-    .I0(1'b0),
-    .I1(1'b1)
-  );
-)");
+    nlwtest::ExpectGolden("instances/bit_init_without_connections_ends_without_comma", Instances());
 }
 
 TEST_F(VerilogWriterInstances, BigEndingCellsConnectLeastSignificantBitFirst) {
@@ -126,23 +105,8 @@ TEST_F(VerilogWriterInstances, BigEndingCellsConnectLeastSignificantBitFirst) {
     Memory("V_ROM", "m");
     Memory("V_REG", "g");
     Memory("V_Dual", "x");
-    EXPECT_EQ(Instances(), R"(  V_RAM   r (
-    .ADDR({a[0], a[1]}),
-    .DATA({d[0], d[1]})
-  );
-  V_ROM   m (
-    .ADDR({a[0], a[1]}),
-    .DATA({d[1], d[0]})
-  );
-  V_REG   g (
-    .ADDR({a[1], a[0]}),
-    .DATA({d[1], d[0]})
-  );
-  V_Dual   x (
-    .ADDR({a[0], a[1]}),
-    .DATA({d[0], d[1]})
-  );
-)");
+    nlwtest::ExpectGolden("instances/big_ending_cells_connect_least_significant_bit_first",
+                          Instances());
 }
 
 TEST_F(VerilogWriterInstances, BigEndingMapLeavesOtherCellsAlone) {
@@ -162,11 +126,7 @@ TEST_F(VerilogWriterInstances, MacroChildrenAreInstantiatedByPort) {
     b_.Connect(i, b_.AddSignal(top_, "n"));
     Nlw_NlBus* w = b_.AddSignalBus(top_, "w", 1, 0);
     b_.Connect(sub->GetPinByAlias("o[0]"), b_.GetSignalBusMember(w, 0));
-    EXPECT_EQ(Instances(), R"(  sub   s1 (
-    .i(n),
-    .o({w[0], 1'bz})
-  );
-)");
+    nlwtest::ExpectGolden("instances/macro_children_are_instantiated_by_port", Instances());
     EXPECT_NE(AfterHead(View()).find("module sub (\n  i, o\n);\n  input i;\n  output [0 : 1] o;\n"),
               std::string::npos);
 }

@@ -1,4 +1,5 @@
 // The chipwide module, the device-data maps and the included cell models.
+#include "TestFiles.h"
 #include "VerilogWriterTest.h"
 
 namespace {
@@ -106,19 +107,7 @@ TEST_F(VerilogWriterLibrary, ModelsAreCopiedOnceAtTheirFirstNeed) {
     b_.CreateLeaf(top, a, "a2");
     b_.CreateLeaf(top, b_.AddLibraryType("V_D", false, false), "d");
     Port_MsgCapture capture;
-    EXPECT_EQ(Models(), R"(// $Header: V_C
-module V_C;
-endmodule
-
-// $Header: V_B
-module V_B;
-endmodule
-
-// $Header: V_A
-module V_A;
-endmodule
-
-)");
+    nlwtest::ExpectGolden("library/models_once", Models());
     EXPECT_TRUE(capture.Texts(Port_MsgLevel::Error).empty());
     EXPECT_EQ(capture.Texts(Port_MsgLevel::Debug).back(),
               "GetParams()->GetWriteInstantiatedTimcells() \n");

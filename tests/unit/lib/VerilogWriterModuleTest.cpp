@@ -1,4 +1,5 @@
 // Module traversal and the layout of one module definition.
+#include "TestFiles.h"
 #include "VerilogWriterTest.h"
 
 namespace {
@@ -28,41 +29,14 @@ protected:
 TEST_F(VerilogWriterModules, WritesEachTypeOnceInReverseMacroOrder) {
     BuildThreeMacros();
     // A comes from a2, the later of the two macros of that type.
-    EXPECT_EQ(AfterHead(View()), R"(module A (
-  z
-);
-  input z;
-endmodule
-
-module B (
-);
-endmodule
-
-module top (
-);
-  A   a1 (
-  );
-  B   b1 (
-  );
-  A   a2 (
-  );
-endmodule
-
-)");
+    nlwtest::ExpectGolden("modules/writes_each_type_once_in_reverse_macro_order",
+                          AfterHead(View()));
 }
 
 TEST_F(VerilogWriterModules, CellDefineWrapsModuleOneLevelDeeper) {
     BuildThreeMacros();
     params_.SetWriteCellDefine(true);
-    EXPECT_EQ(Module(a2_), R"(`celldefine
-  module A (
-    z
-  );
-    input z;
-  endmodule
-`endcelldefine
-
-)");
+    nlwtest::ExpectGolden("modules/cell_define_wraps_module_one_level_deeper", Module(a2_));
 }
 
 TEST_F(VerilogWriterModules, UseLibDirectiveEndsFileAfterChipwide) {
@@ -111,19 +85,7 @@ TEST_F(VerilogWriterModules, BlackBoxModeHidesTheBodyFromSynthesis) {
     BuildThreeMacros();
     nlw_.SetIsVornixCore(true);
     params_.SetFuncellMode(true);
-    EXPECT_EQ(Module(a2_),
-              "module A (\n"
-              "  z\n"
-              ")/* synthesis syn_black_box syn_noprune=1 */;\n"
-              "  input z;\n"
-              "  \n"
-              "  // synthesis translate_off\n"
-              "  \n"
-              "\n"
-              "// synthesis translate_on\n"
-              "\n"
-              "endmodule\n"
-              "\n");
+    nlwtest::ExpectGolden("modules/black_box_mode_hides_the_body_from_synthesis", Module(a2_));
     // Either flag alone writes a plain module.
     nlw_.SetIsVornixCore(false);
     EXPECT_EQ(Module(a2_), "module A (\n  z\n);\n  input z;\nendmodule\n\n");

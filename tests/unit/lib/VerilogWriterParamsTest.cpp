@@ -1,7 +1,6 @@
 // Cell parameters: inline lists, defparam statements, typed formatting and
 // the hex and bit string classification.
-#include <functional>
-
+#include "TestFiles.h"
 #include "VerilogWriterTest.h"
 
 namespace {
@@ -45,24 +44,7 @@ TEST_F(VerilogWriterParams, InlineListStandsBetweenTypeAndInstanceName) {
     b_.Connect(u1->FindPin("O"), b_.AddSignal(top_, "o"));
     Lut("u2", {Vdm_Property::NewString("INIT", "16'h0001")});
     Lut("u3", {});
-    EXPECT_EQ(Module(top_), R"(module top (
-);
-  wire o;
-  V_LUT4 #(
-    .INIT ( 16'h8000 ),
-    .MODE ( "FAST" ))
-  u1 (
-    .O(o)
-  );
-  V_LUT4 #(
-    .INIT ( 16'h0001 ))
-  u2 (
-  );
-  V_LUT4   u3 (
-  );
-endmodule
-
-)");
+    nlwtest::ExpectGolden("params/inline", Module(top_));
 }
 
 TEST_F(VerilogWriterParams, DefparamModeWritesStatementsBeforeLibraryCellsOnly) {
@@ -72,17 +54,7 @@ TEST_F(VerilogWriterParams, DefparamModeWritesStatementsBeforeLibraryCellsOnly) 
     // Neither a timing nor a functional cell: no parameters at all.
     Lut("u-2", {Vdm_Property::NewString("INIT", "16'h8000")},
         b_.AddLibraryType("V_OTHER", false, false));
-    EXPECT_EQ(Module(top_), R"(module top (
-);
-  defparam u1.INIT = 16'h8000;
-  defparam u1.MODE = "FAST";
-  V_LUT4 u1 (
-  );
-  V_OTHER \u-2  (
-  );
-endmodule
-
-)");
+    nlwtest::ExpectGolden("params/defparam", Module(top_));
 }
 
 TEST_F(VerilogWriterParams, TypedFormattingFollowsTypeAndClassification) {
@@ -90,35 +62,14 @@ TEST_F(VerilogWriterParams, TypedFormattingFollowsTypeAndClassification) {
     root_.File(
         "data/device.key",
         "HexStringProperty = hexint, HEXSTR, hexstr\nBitStringProperty = BITS, INIT_BIT, XON\n");
-    struct Row {
-        std::function<Vdm_Property*()> make;
-        const char* inlineText;
-        const char* defparamLine;
-    };
-    const Row rows[] = {
-        {[] { return Vdm_Property::NewFloat("F", 1.5); }, ".F ( 1.5000 )",
-         "defparam \\u-1 .F = 1.5000;"},
-        {[] { return Vdm_Property::NewInt("HEXINT", 10); }, ".HEXINT ( 12'h00A )",
-         "defparam \\u-1 .HEXINT = 12'h00A;"},
-        {[] { return Vdm_Property::NewInt("N", -5); }, ".N ( -5 )", "defparam \\u-1 .N = -5;"},
-        {[] { return Vdm_Property::NewString("HEXSTR", "1F"); }, ".HEXSTR ( 8'h1F )",
-         "defparam \\u-1 .HEXSTR = 8'h1F;"},
-        {[] { return Vdm_Property::NewString("xon", "true"); }, ".notifier ( 1'bx )",
-         "initial assign \\u-1 .notifier = 1'bx;"},
-        {[] { return Vdm_Property::NewString("XON", "0"); }, ".XON ( 1'b0 )",
-         "defparam \\u-1 .XON = 1'b0;"},
-        {[] { return Vdm_Property::NewString("init_bit", "01"); }, ".INIT ( 2'b01 )",
-         "defparam \\u-1 .INIT = 2'b01;"},
-        {[] { return Vdm_Property::NewString("BITS", "0110"); }, ".BITS ( 4'b0110 )",
-         "defparam \\u-1 .BITS = 4'b0110;"},
-        {[] { return Vdm_Property::NewString("MODE", "fast\"x"); }, ".MODE ( \"FAST\\\"X\" )",
-         "defparam \\u-1 .MODE = \"FAST\\\"X\";"},
-    };
-    for (const Row& row : rows) {
-        Nlw_NlBlock* u = Lut("u-1", {row.make()});
-        EXPECT_EQ(Inline(u), std::string("#(\n  ") + row.inlineText + ")\n");
-        EXPECT_EQ(Defparam(u), std::string(row.defparamLine) + "\n");
-    }
+    Nlw_NlBlock* u = Lut(
+        "u-1", {Vdm_Property::NewFloat("F", 1.5), Vdm_Property::NewInt("HEXINT", 10),
+                Vdm_Property::NewInt("N", -5), Vdm_Property::NewString("HEXSTR", "1F"),
+                Vdm_Property::NewString("xon", "true"), Vdm_Property::NewString("XON", "0"),
+                Vdm_Property::NewString("init_bit", "01"), Vdm_Property::NewString("BITS", "0110"),
+                Vdm_Property::NewString("MODE", "fast\"x")});
+    nlwtest::ExpectGolden("params/typed_inline", Inline(u));
+    nlwtest::ExpectGolden("params/typed_defparam", Defparam(u));
 }
 
 TEST_F(VerilogWriterParams, VerbatimFormattingWritesTextsAsTheyStand) {

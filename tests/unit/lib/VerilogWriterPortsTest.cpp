@@ -1,4 +1,5 @@
 // Port lists and declarations, wire declarations and the assign statement.
+#include "TestFiles.h"
 #include "VerilogWriterTest.h"
 
 namespace {
@@ -19,17 +20,7 @@ TEST_F(VerilogWriterPorts, ScalarsComeBeforeBusesWhateverThePinOrder) {
     b_.AddPort(m, "e-1", NLW_DIR_INOUT);
     b_.SetVisible(b_.AddPort(m, "hidden", NLW_DIR_INPUT), false);
     b_.SetValid(b_.AddPortBus(m, "bad", NLW_DIR_INPUT, 1, 0), false);
-    EXPECT_EQ(Module(m), R"(module m (
-  a, y, \e-1 , d, q
-);
-  input a;
-  output y;
-  inout \e-1 ;
-  input [3 : 0] d;
-  inout [0 : 1] q;
-endmodule
-
-)");
+    nlwtest::ExpectGolden("ports/scalars_come_before_buses_whatever_the_pin_order", Module(m));
 }
 
 TEST_F(VerilogWriterPorts, UntypedPortIsListedButNotDeclared) {
@@ -60,15 +51,7 @@ TEST_F(VerilogWriterPorts, AkaCommentsOnlyWhenAsked) {
     const std::string plain = Module(m);
     EXPECT_EQ(plain.find("AKA"), std::string::npos);
     params_.SetWriteAka(true);
-    EXPECT_EQ(Module(m), R"(module m (
-  a, d
-);
-  input a; // AKA:A_orig
-  input [1 : 0] d; // AKA:D_orig
-  wire n; // AKA:N_orig
-endmodule
-
-)");
+    nlwtest::ExpectGolden("ports/aka_comments_only_when_asked", Module(m));
 }
 
 TEST_F(VerilogWriterPorts, WiresListScalarsBeforeBuses) {
@@ -80,15 +63,7 @@ TEST_F(VerilogWriterPorts, WiresListScalarsBeforeBuses) {
     b_.SetValid(b_.AddSignalBus(m, "bad", 1, 0), false);
     Nlw_NlBus* sb = b_.AddSignalBus(m, "sb", 1, 0);
     b_.GetSignalBusMember(sb, 1);  // a member is declared with its bus only
-    EXPECT_EQ(Module(m), R"(module m (
-);
-  wire n1;
-  wire \n-2 ;
-  wire [3 : 0] bus;
-  wire [1 : 0] sb;
-endmodule
-
-)");
+    nlwtest::ExpectGolden("ports/wires_list_scalars_before_buses", Module(m));
 }
 
 TEST_F(VerilogWriterPorts, AssignJoinsPortsToDifferentlyNamedNets) {

@@ -1,4 +1,5 @@
 // File heads, the library search and the timing annotation statement.
+#include "TestFiles.h"
 #include "VerilogWriterTest.h"
 
 namespace {
@@ -45,46 +46,7 @@ TEST_F(VerilogWriterPreamble, LineBreaksInHeaderFieldsStayInsideTheComment) {
 }
 
 TEST_F(VerilogWriterPreamble, SingleFileHead) {
-    EXPECT_EQ(View(),
-              "////////////////////////////////////////////////////////////////////////////////\n"
-              "// Copyright (c) Vornix. All rights reserved.\n"
-              "////////////////////////////////////////////////////////////////////////////////\n"
-              "//\n"
-              "//       | |\n"
-              "//    +------+    Vendor: Vornix\n"
-              "//  --|      |--  Version: 0.1\n"
-              "//  --|  VX  |--  Application: qdb2ver\n"
-              "//  --|      |--  Filename: top.v\n"
-              "//    +------+    Timestamp: Thu Jan  1 00:00:00 2026\n"
-              "//       | |\n"
-              "//\n"
-              "//             \n"
-              "// Command\t: qdb2ver -w top.qdb\n"
-              "// Device\t: vx100 fg256 -5\n"
-              "// Input file\t: top.qdb\n"
-              "// Output file\t: top.v\n"
-              "// # of Modules\t: 1\n"
-              "// Design Name\t: demo\n"
-              "// Vornix        : /opt/vornix\n"
-              "//             \n"
-              "// Purpose:    \n"
-              "//     This verilog netlist is a verification model and uses simulation \n"
-              "//     primitives which may not represent the true implementation of the \n"
-              "//     device, however the netlist is functionally correct and should not \n"
-              "//     be modified. This file cannot be synthesized and should only be used \n"
-              "//     with supported simulation tools.\n"
-              "//             \n"
-              "// Reference:  \n"
-              "//     Vornix Netlist Writer User Guide and Vornix Simulation Library Guide\n"
-              "//             \n"
-              "////////////////////////////////////////////////////////////////////////////////\n"
-              "\n"
-              "`timescale 1 ns/1 ps\n"
-              "\n"
-              "module top (\n"
-              ");\n"
-              "endmodule\n"
-              "\n");
+    nlwtest::ExpectGolden("preamble/single_file_head", View());
 }
 
 TEST_F(VerilogWriterPreamble, ModuleFileNamesItsModule) {
@@ -103,24 +65,7 @@ TEST_F(VerilogWriterPreamble, PurposeTextsFollowTheModesInFixedOrder) {
     params_.SetStaMode(true);
     params_.SetEcnMode(true);
     params_.SetWritePsTimePrecision(false);
-    EXPECT_EQ(Purpose(),
-              "// Purpose:    \n"
-              "//     This verilog netlist is a verification model and uses library \n"
-              "//     primitives which may not represent the true implementation of \n"
-              "//     the device, however the netlist is functionally correct and \n"
-              "//     should not be modified. This file cannot be synthesized and \n"
-              "//     should only be used with supported equivalence checking tools.\n"
-              "//     This verilog netlist is a verification model and uses library \n"
-              "//     primitives which may not represent the true implementation of \n"
-              "//     the device, however the netlist is functionally correct and \n"
-              "//     should not be modified. This file cannot be synthesized and \n"
-              "//     should only be used with supported static timing analysis tools.\n"
-              "//             \n"
-              "// Reference:  \n"
-              "//     Vornix Netlist Writer User Guide\n"
-              "//             \n"
-              "////////////////////////////////////////////////////////////////////////////////\n"
-              "\n");
+    nlwtest::ExpectGolden("preamble/purpose_texts_follow_the_modes_in_fixed_order", Purpose());
     EXPECT_NE(View().find("\n`timescale 1 ns/10 ps\n\n"), std::string::npos);
 }
 
@@ -193,34 +138,16 @@ TEST_F(VerilogWriterPreamble, ShortModuleFileHead) {
     root_.Dir("verilog/src/timcells");
     auto writer = MakeWriter();
     writer->WriteMHHeader(top_);
-    EXPECT_EQ(writer->GetMemoryText(),
-              "// Vornix Verilog netlist produced by qdb2ver application (version 0.1)\n"
-              "// This netlist is one of multiple netlists created for the\n"
-              "// design using tessel's write multiple hierarchy files option.\n"
-              "\n"
-              "// Design name : demo\n"
-              "// Module name : top\n"
-              "\n"
-              "// This verilog netlist is a simulation model and uses simulation \n"
-              "// primitives which may not represent the true implementation of the \n"
-              "// device, however the netlist is functionally correct and should not \n"
-              "// be modified. This file cannot be synthesized and should only be used \n"
-              "// with supported simulation tools.\n"
-              "\n"
-              "`timescale 1 ns/1 ps\n"
-              "`uselib dir=" +
-                  root_.Path() + "/verilog/src/timcells libext=.v\n\n");
-
+    nlwtest::ExpectGolden("preamble/short_head",
+                          nlwtest::Replaced(writer->GetMemoryText(), root_.Path(), "<root>"));
     // The disclaimer follows the mode, equivalence checking first.
     params_.SetWriteUseLib(false);
-    for (const char* tools : {"static timing analysis tools", "equivalence checking tools"}) {
+    for (const char* tools : {"sta", "ecn"}) {
         params_.SetStaMode(true);
         params_.SetEcnMode(tools[0] == 'e');
         writer = MakeWriter();
         writer->WriteMHHeader(top_);
-        EXPECT_NE(writer->GetMemoryText().find("// should only be used with supported " +
-                                               std::string(tools) + ". \n\n"),
-                  std::string::npos);
+        nlwtest::ExpectGolden(std::string("preamble/short_head_") + tools, writer->GetMemoryText());
     }
 }
 

@@ -4,6 +4,7 @@
 #include <string>
 
 #include "HostTestSupport.h"
+#include "TestFiles.h"
 #include "port/Port.h"
 
 namespace {
@@ -72,10 +73,7 @@ TEST_F(PortMsg, ConsolePresentation) {
     EXPECT_EQ(out,
               "Writing Verilog netlist file 'top.v' ...\n"
               "INFO:NetListWriters - 1 notice\n");
-    EXPECT_EQ(err,
-              "WARNING:NetListWriters - Padding or triming the value for hex property INIT:\n"
-              "ERROR:NetListWriters - error e\n"
-              "INTERNAL_ERROR:NetListWriters - internal\n");
+    nlwtest::ExpectGolden("msg/console_presentation", err);
 }
 
 TEST_F(PortMsg, QuietDropsStatusAndDebugShowsTraces) {
@@ -90,12 +88,7 @@ TEST_F(PortMsg, QuietDropsStatusAndDebugShowsTraces) {
     std::string out = testing::internal::GetCapturedStdout();
     std::string err = testing::internal::GetCapturedStderr();
     EXPECT_EQ(out, "INFO:NetListWriters - 1 notice\n");
-    EXPECT_EQ(err,
-              "WARNING:NetListWriters - Padding or triming the value for hex property INIT:\n"
-              "ERROR:NetListWriters - error e\n"
-              "INTERNAL_ERROR:NetListWriters - internal\n"
-              "DEBUG: Adding (A:B) to the recursive inclusion map.\n"
-              "WARNING:OtherDomain - from elsewhere\n");
+    nlwtest::ExpectGolden("msg/quiet_drops_status_and_debug_shows_traces", err);
     // Quiet is about the console only.
     EXPECT_EQ(capture.Texts(Port_MsgLevel::Status).size(), 1u);
     EXPECT_EQ(m.GetCount(Port_MsgLevel::Status), 1);
@@ -109,13 +102,7 @@ TEST_F(PortMsg, LogFileGetsEverything) {
     ASSERT_TRUE(m.OpenLog((dir / "run.log").c_str()));
     IssueOneOfEach();
     m.CloseLog();
-    EXPECT_EQ(hosttest::ReadFile(dir / "run.log"),
-              "STATUS:NetListWriters - Writing Verilog netlist file 'top.v' ...\n"
-              "INFO:NetListWriters - 1 notice\n"
-              "WARNING:NetListWriters - Padding or triming the value for hex property INIT:\n"
-              "ERROR:NetListWriters - error e\n"
-              "INTERNAL_ERROR:NetListWriters - internal\n"
-              "DEBUG: Adding (A:B) to the recursive inclusion map.\n");
+    nlwtest::ExpectGolden("msg/log_file_gets_everything", hosttest::ReadFile(dir / "run.log"));
     EXPECT_FALSE(m.OpenLog((dir / "no/such/dir/run.log").c_str()));
 }
 
