@@ -20,14 +20,7 @@ contains() {  # description file text
     if grep -qF -- "$3" "$2"; then echo "ok   $1"; else echo "FAIL $1: '$3' not in output"; head -20 "$2"; fail=1; fi
 }
 
-cat > "$work/rtl.v" <<'V'
-module leaf(input a, input b, output y); assign y = a ^ b; endmodule
-module top(input [1:0] d, output y, output z);
-  leaf u(.a(d[0]), .b(d[1]), .y(y));
-  assign z = ~d[0];
-endmodule
-V
-yosys -q -p "read_verilog $work/rtl.v; synth -top top; write_json $work/top.json"
+yosys -q -p "read_verilog $src/tests/data/programs/top.v; synth -top top; write_json $work/top.json"
 
 expect "qdb2ver -h exits 0" 0 "$bin/qdb2ver" -h
 contains "qdb2ver -h prints the option lines" "$work/out.txt" "-aka                Write Also-Know-As names as comments."
@@ -75,21 +68,8 @@ contains "the module is named chip" "$work/chip.v" "module chip"
 # buffers the pad pins sit on the ports themselves; output pads drive
 # nothing and are kept explicitly.
 mkdir -p "$work/pins"
-cat > "$work/pins/chip.v" <<'V'
-module sub(input a, input b, output y); assign y = a & b; endmodule
-module chip(input clk, input [1:0] d, output q, (* LOC = "P9" *) output z);
-  (* LOC = "P1" *) V_IPAD p_clk(.PAD(clk));
-  (* PINNAME = "P2" *) V_IPAD p_d0(.PAD(d[0]));
-  (* LOC = "P3" *) V_IPAD p_d1(.PAD(d[1]));
-  (* keep, LOC = "P4" *) V_OPAD p_q(.PAD(q));
-  (* keep *) V_OPAD p_z(.PAD(z));
-  reg r; always @(posedge clk) r <= d[0];
-  assign q = r;
-  sub u(.a(d[0]), .b(d[1]), .y(z));
-endmodule
-V
 expect "rtl2json maps the pad design" 0 \
-    "$src/flow/rtl2json" -noiopad -part vx100-fg256-5 chip "$work/pins/chip.json" "$work/pins/chip.v"
+    "$src/flow/rtl2json" -noiopad -part vx100-fg256-5 chip "$work/pins/chip.json" "$src/tests/data/programs/chip.v"
 expect "qdb2ver -pf writes the pin map" 0 "$bin/qdb2ver" -pf -w "$work/pins/chip.json"
 contains "the pin file is announced" "$work/out.txt" "Writing pin file '$work/pins/chip.pin' ..."
 contains "the pin file names the design" "$work/pins/chip.pin" "// Design name: chip"

@@ -52,6 +52,11 @@ inline bool Exists(const std::string& path) {
     return ::stat(path.c_str(), &st) == 0;
 }
 
+// A data file's text, by its path below tests/data.
+inline std::string Data(const std::string& rel) {
+    return ReadFile(std::string(NLW_TEST_DATA_DIR) + "/" + rel);
+}
+
 // text with every from replaced by to: keeps run-dependent parts (versions,
 // temporary paths) out of golden files.
 inline std::string Replaced(std::string text, const std::string& from, const std::string& to) {

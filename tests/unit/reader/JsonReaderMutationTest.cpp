@@ -13,37 +13,7 @@ using readertest::LoadText;
 
 // A small hierarchical design in the layout yosys writes: buses with offset
 // and upto, constants, parameters of every form, a blackbox cell type.
-const char* const kDesign = R"({
-  "modules": {
-    "leaf": {
-      "attributes": { "blackbox": "00000000000000000000000000000001" },
-      "ports": { "A": { "direction": "input", "bits": [ 2, 3 ] },
-                 "Y": { "direction": "output", "bits": [ 4 ] } },
-      "cells": { }, "netnames": { }
-    },
-    "mid": {
-      "ports": { "i": { "direction": "input", "bits": [ 2, 3 ], "offset": 4, "upto": 1 },
-                 "o": { "direction": "output", "bits": [ 5 ] } },
-      "cells": {
-        "u": { "hide_name": 0, "type": "leaf",
-               "parameters": { "INIT": "0110", "NAME": "fast ", "N": 7 },
-               "attributes": { "hdlname": "mid u" },
-               "connections": { "A": [ 2, "1" ], "Y": [ 5 ] } }
-      },
-      "netnames": { "i": { "hide_name": 0, "bits": [ 2, 3 ], "offset": 4, "upto": 1 },
-                    "$n": { "hide_name": 1, "bits": [ 5 ] } }
-    },
-    "top": {
-      "attributes": { "top": "00000000000000000000000000000001" },
-      "ports": { "d": { "direction": "input", "bits": [ 2, 3 ] },
-                 "q": { "direction": "output", "bits": [ 4, "0", "x" ] } },
-      "cells": {
-        "m": { "hide_name": 0, "type": "mid", "connections": { "i": [ 2, 3 ], "o": [ 4 ] } }
-      },
-      "netnames": { "d": { "hide_name": 0, "bits": [ 2, 3 ] } }
-    }
-  }
-})";
+const std::string kDesign = nlwtest::Data("json/mutation_base.json");
 
 TEST(JsonReaderMutation, CorruptedFilesLoadOrGiveOneError) {
     ASSERT_TRUE(LoadText(kDesign).ok);

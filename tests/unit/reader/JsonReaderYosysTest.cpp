@@ -25,23 +25,7 @@ protected:
     TempDir dir_;
 };
 
-const char* kBusDesign = R"(
-module sub(input [3:0] a, input [0:3] b, output [3:0] y, output [1:2] u, output z);
-  assign y = a ^ b;
-  assign u = {a[0], 1'b1};
-  assign z = 1'b0;
-endmodule
-module t(input clk, input [3:0] a, input [0:3] b, output [3:0] y, output [1:2] u,
-         output z, output k, output w);
-  wire [3:0] yy;
-  sub s(.a(a), .b(b), .y(yy), .u(u), .z(z));
-  reg [3:0] r;
-  always @(posedge clk) r <= yy;
-  assign y = r;
-  assign k = 1'b1;
-  assign w = a[0];
-endmodule
-)";
+const std::string kBusDesign = nlwtest::Data("verilog/bus_design.v");
 
 TEST_F(JsonReaderYosys, ReadsHierarchyBusesAndConstants) {
     Loaded l = Synth(kBusDesign, "synth -top t");
@@ -81,12 +65,7 @@ TEST_F(JsonReaderYosys, ReadsHierarchyBusesAndConstants) {
 }
 
 TEST_F(JsonReaderYosys, ReadsLookupTablesOfEveryWidth) {
-    Loaded l = Synth(R"(
-module t(input [3:0] a, input [3:0] b, input cin, output [4:0] s, output eq);
-  assign s = a + b + cin;
-  assign eq = a == b;
-endmodule)",
-                     "synth -top t -lut 4");
+    Loaded l = Synth(nlwtest::Data("verilog/luts.v"), "synth -top t -lut 4");
     if (!l.ok) return;
     std::set<int> widths;
     for (Nlw_NlBlock* c : l.root()->GetChildren()) {
@@ -120,12 +99,7 @@ endmodule)",
 }
 
 TEST_F(JsonReaderYosys, TakesBlackboxModulesAsCellTypes) {
-    Loaded l = Synth(R"(
-(* blackbox *) module macro_cell(input [1:0] d, input e, output q); endmodule
-module t(input [1:0] d, input e, output q);
-  macro_cell #(.MODE("FAST"), .W(3)) m(.d(d), .e(e), .q(q));
-endmodule)",
-                     "hierarchy -top t; proc");
+    Loaded l = Synth(nlwtest::Data("verilog/blackbox.v"), "hierarchy -top t; proc");
     if (!l.ok) return;
     EXPECT_EQ(l.view->GetNumMacros(), 1u);
     Nlw_NlBlock* m = Child(l.root(), "m");
@@ -143,19 +117,7 @@ endmodule)",
     EXPECT_EQ(std::string(w->GetString()).substr(29), "011");
 }
 
-const char* kTwoLevels = R"(
-module leafm(input clk, input [1:0] d, output reg [1:0] q);
-  always @(posedge clk) q <= d;
-endmodule
-module mid(input clk, input [1:0] i, output [1:0] o);
-  wire [1:0] inner;
-  leafm u2(.clk(clk), .d(i), .q(inner));
-  assign o = ~inner;
-endmodule
-module t(input clk, input [1:0] a, output [1:0] y);
-  mid u1(.clk(clk), .i(a), .o(y));
-endmodule
-)";
+const std::string kTwoLevels = nlwtest::Data("verilog/two_levels.v");
 
 // Flattened by yosys (keeping hdlnames) or by the reader on request.
 TEST_F(JsonReaderYosys, ReadsATwoLevelDesignFlattenedEitherWay) {

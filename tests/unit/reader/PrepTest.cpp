@@ -149,15 +149,7 @@ std::vector<std::string> ListOf(const Nlw_NlBlock* b) {
 
 TEST(PrepProperties, OffersKnownCellsAndKeepsOthersAsLiterals) {
     Installation inst(DataFiles{{"cells.dat", TestCells()}});
-    Loaded l = LoadText(R"({"modules": {"t": {
-        "ports": { "o": { "direction": "output", "bits": [ 2 ] } },
-        "cells": {
-          "lut": { "type": "LUT2", "parameters": { "INIT": "0110", "FOO": "1",
-                                                     "INITSTATE": "1" } },
-          "ff": { "type": "FD", "parameters": { "INIT": "1", "MODE": "FAST", "N": 5 },
-                  "attributes": { "TYPE": "slow" } },
-          "pad": { "type": "OPAD", "connections": { "PAD": [ 2 ] } } },
-        "netnames": { "o": { "bits": [ 2 ], "attributes": { "LOC": "P3" } } }}}})");
+    Loaded l = LoadText(nlwtest::Data("json/prep_cells.json"));
     ASSERT_TRUE(l.ok) << l.errors[0];
     RecordingWriter nlw;
     nlw.SetView(l.view.get());

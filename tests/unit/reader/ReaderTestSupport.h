@@ -13,6 +13,7 @@
 #include <string>
 #include <vector>
 
+#include "ModelText.h"
 #include "TestFiles.h"
 #include "model/Nlw_Nl.h"
 #include "port/Port.h"
@@ -61,23 +62,8 @@ private:
 };
 
 // A small library of cells the tests know by heart.
-inline const char* TestCells() {
-    return "cell LUT2 timcell\n"
-           "pin I0 input\n"
-           "pin I1 input\n"
-           "pin O output\n"
-           "cell FD timcell\n"
-           "pin C input\n"
-           "pin D input\n"
-           "pin Q output\n"
-           "cell RAM funcell\n"
-           "bus A input 3 0\n"
-           "bus DO output 0 7\n"
-           "pin CLK input\n"
-           "cell IPAD timcell pad\n"
-           "pin PAD output pad\n"
-           "cell OPAD timcell pad\n"
-           "pin PAD input pad\n";
+inline std::string TestCells() {
+    return nlwtest::Data("cells/test_cells.dat");
 }
 
 // A loaded design with the messages the load gave.
@@ -98,6 +84,14 @@ inline Loaded LoadText(const std::string& json, Nlw_ReadOptions options = {},
     l.errors = capture.Texts(Port_MsgLevel::Error);
     l.warnings = capture.Texts(Port_MsgLevel::Warning);
     return l;
+}
+
+// The loaded design and the load's messages, for a golden file.
+inline std::string Text(const Loaded& l) {
+    std::string out = nlwtest::ModelText(*l.view);
+    for (const std::string& e : l.errors) out += "error: " + e;
+    for (const std::string& w : l.warnings) out += "warning: " + w;
+    return out;
 }
 
 inline Loaded LoadFile(const std::string& path, Nlw_ReadOptions options = {}) {
@@ -130,19 +124,6 @@ inline std::string Synthesize(const TempDir& dir, const std::string& verilog,
 inline Nlw_NlBlock* Child(const Nlw_NlBlock* parent, const std::string& name) {
     for (Nlw_NlBlock* c : parent->GetChildren())
         if (name == c->GetInstanceName()) return c;
-    return nullptr;
-}
-
-inline Nlw_NlSignal* Signal(const Nlw_NlBlock* macro, const std::string& name) {
-    for (Nlw_NlSignal* s : macro->GetSignals())
-        if (name == s->GetWritableName()) return s;
-    return nullptr;
-}
-
-inline Nlw_NlBus* SignalBus(const Nlw_NlBlock* macro, const std::string& name) {
-    if (const UT_DARRAY<Nlw_NlBus*>* buses = macro->GetSignalBuses())
-        for (Nlw_NlBus* b : *buses)
-            if (name == b->GetWritableName()) return b;
     return nullptr;
 }
 
