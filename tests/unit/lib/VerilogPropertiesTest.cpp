@@ -8,17 +8,10 @@
 #include <vector>
 
 #include "Nlw_Verilog.h"
+#include "TestFiles.h"
 #include "model/Nlw_NlBuilder.h"
 
 namespace {
-
-const char* const kW1 =
-    "Mismatched property type detected - type %s expected for property %s:, but type bool "
-    "detected, ignored.\n";
-
-std::string Format(const char* format, const char* a, const char* b = nullptr) {
-    return b ? vorform(format, a, b) : vorform(format, a);
-}
 
 class VerilogProperties : public ::testing::Test {
 protected:
@@ -48,6 +41,16 @@ protected:
         return result->GetString();
     }
 
+    // One line per offer: what was added (or "<none>") and the messages.
+    std::string OfferLine(const std::string& label, Vdm_Property* property) {
+        Port_MsgCapture capture;
+        std::string line = label + " -> " + Offer(property, property->GetName());
+        for (const Port_Msg& m : capture.msgs)
+            line += std::string(" | ") + "DSIWEX"[static_cast<int>(m.level)] + ": " + m.text;
+        if (capture.msgs.empty()) line += "\n";
+        return line;
+    }
+
     Nlw_Verilog nlw;
     Nlw_NlView view;
     Nlw_NlBlock* cell = nullptr;
@@ -55,100 +58,53 @@ protected:
     std::unique_ptr<Vdm_Property> list;
 };
 
-struct ConversionCase {
-    const char* label;
-    std::function<Vdm_Property*()> make;  // a property named P
-    const char* type;                     // the definition's expected type
-    const char* dflt;
-    const char* expected;  // "<none>" when nothing is added
-    std::string warning;   // "" when none
-};
-
 TEST_F(VerilogProperties, ConvertsByTypeCodeAndExpectedType) {
-    const std::vector<ConversionCase> cases = {
-        {"bool BL", [] { return Vdm_Property::NewBool("P", false); }, "BL", "", "true", ""},
-        {"bool S", [] { return Vdm_Property::NewBool("P", true); }, "S", "", "<none>",
-         Format(kW1, "S", "P")},
-        {"float F", [] { return Vdm_Property::NewFloat("P", 2.5); }, "F", "", "2.500000", ""},
-        {"float I", [] { return Vdm_Property::NewFloat("P", 2.5); }, "I", "", "<none>",
-         Format("Mismatched property type detected - type %s expected for property %s:, but "
-                "type float detected, ignored.\n",
-                "I", "P")},
-        {"int I", [] { return Vdm_Property::NewInt("P", -12); }, "I", "", "-12", ""},
-        {"int S", [] { return Vdm_Property::NewInt("P", 7); }, "s", "", "\"7\"", ""},
-        {"int HV", [] { return Vdm_Property::NewInt("P", 7); }, "HV", "16'h0000", "<none>",
-         Format("Mismatched property type detected - type %s expected for property %s:, but "
-                "type integer detected, ignored.\n",
-                "HV", "P")},
-        {"string S", [] { return Vdm_Property::NewString("P", "hello"); }, "S", "", "\"hello\"",
-         ""},
-        {"string BL", [] { return Vdm_Property::NewString("P", "yes"); }, "BL", "", "\"YES\"", ""},
-        {"string F", [] { return Vdm_Property::NewString("P", "1.5e-3"); }, "F", "", "1.5e-3", ""},
-        {"string I", [] { return Vdm_Property::NewString("P", "3"); }, "I", "", "<none>",
-         Format("Mismatched property type detected - type %s expected for property %s:, but "
-                "type string detected, ignored.\n",
-                "I", "P")},
-        {"typedef", [] { return Vdm_Property::NewTypeDef("P", {"a"}); }, "S", "", "<none>",
-         Format("Invalid property type detected - %s, ignored.\n", "P")},
-        {"bits", [] { return Vdm_Property::NewBits("P", "01"); }, "BV", "2'b00", "<none>",
-         Format("Invalid property type detected - %s, ignored.\n", "P")},
+    const struct {
+        std::function<Vdm_Property*()> make;  // a property named P
+        const char* type;                     // the definition's expected type
+        const char* dflt;
+    } cases[] = {
+        {[] { return Vdm_Property::NewBool("P", false); }, "BL", ""},
+        {[] { return Vdm_Property::NewBool("P", true); }, "S", ""},
+        {[] { return Vdm_Property::NewFloat("P", 2.5); }, "F", ""},
+        {[] { return Vdm_Property::NewFloat("P", 2.5); }, "I", ""},
+        {[] { return Vdm_Property::NewInt("P", -12); }, "I", ""},
+        {[] { return Vdm_Property::NewInt("P", 7); }, "s", ""},
+        {[] { return Vdm_Property::NewInt("P", 7); }, "HV", "16'h0000"},
+        {[] { return Vdm_Property::NewString("P", "hello"); }, "S", ""},
+        {[] { return Vdm_Property::NewString("P", "yes"); }, "BL", ""},
+        {[] { return Vdm_Property::NewString("P", "1.5e-3"); }, "F", ""},
+        {[] { return Vdm_Property::NewString("P", "3"); }, "I", ""},
+        {[] { return Vdm_Property::NewTypeDef("P", {"a"}); }, "S", ""},
+        {[] { return Vdm_Property::NewBits("P", "01"); }, "BV", "2'b00"},
     };
-    for (const ConversionCase& c : cases) {
+    std::string text;
+    for (const auto& c : cases) {
         definitions = {Nlw_Property("P", c.type, c.dflt)};
-        Port_MsgCapture capture;
-        EXPECT_EQ(Offer(c.make(), "P"), c.expected) << c.label;
-        const std::vector<std::string> warnings = capture.Texts(Port_MsgLevel::Warning);
-        if (c.warning.empty()) {
-            EXPECT_TRUE(warnings.empty()) << c.label;
-        } else {
-            EXPECT_EQ(warnings, std::vector<std::string>{c.warning}) << c.label;
-        }
-        EXPECT_EQ(capture.msgs.size(), warnings.size()) << c.label;
+        Vdm_Property* p = c.make();
+        text += OfferLine(std::string(p->GetPropertyTypeName()) + " as " + c.type, p);
     }
+    nlwtest::ExpectGolden("properties/conversions", text);
 }
 
-struct VectorCase {
-    const char* type;
-    const char* dflt;
-    const char* value;
-    const char* expected;
-    bool warns;
-};
-
+// Vectors are sized by the default's width; widths that are no decimal
+// number fall back to the value's own.
 TEST_F(VerilogProperties, SizesVectorsByTheDefaultsWidth) {
-    const std::vector<VectorCase> cases = {
-        {"HV", "16'h0000", "ABCD", "16'hABCD", false},
-        {"HV", "0000", "ABC", "12'hABC", false},
-        {"HV", "", "AB", "8'hAB", false},
-        {"HV", "12'h000", "AB", "12'h0AB", true},
-        {"HV", "10'h000", "3FF", "10'h3FF", false},
-        {"HV", "4'h0", "ABCD", "4'hD", true},
-        {"BV", "4'b0000", "101", "4'b0101", true},
-        {"BV", "2'b00", "1101", "2'b01", true},
-        {"BV", "0", "110", "3'b110", false},
-        // Widths that are no decimal number fall back to the value's own.
-        {"HV", "x'h00", "ABC", "12'hABC", false},
-        {"BV", "4b'0", "10", "2'b10", false},
-        {"HV", "0'h0", "A", "4'hA", false},
+    const struct {
+        const char *type, *dflt, *value;
+    } cases[] = {
+        {"HV", "16'h0000", "ABCD"}, {"HV", "0000", "ABC"},    {"HV", "", "AB"},
+        {"HV", "12'h000", "AB"},    {"HV", "10'h000", "3FF"}, {"HV", "4'h0", "ABCD"},
+        {"BV", "4'b0000", "101"},   {"BV", "2'b00", "1101"},  {"BV", "0", "110"},
+        {"HV", "x'h00", "ABC"},     {"BV", "4b'0", "10"},     {"HV", "0'h0", "A"},
     };
-    for (const VectorCase& c : cases) {
+    std::string text;
+    for (const auto& c : cases) {
         definitions = {Nlw_Property("P", c.type, c.dflt)};
-        Port_MsgCapture capture;
-        EXPECT_EQ(Offer(Vdm_Property::NewString("P", c.value), "P"), c.expected)
-            << c.type << " " << c.dflt << " " << c.value;
-        const std::vector<std::string> warnings = capture.Texts(Port_MsgLevel::Warning);
-        if (c.warns) {
-            const bool hex = c.type[0] == 'H' || c.type[0] == 'h';
-            EXPECT_EQ(warnings,
-                      std::vector<std::string>{hex ? "Padding or triming the value for hex "
-                                                     "property P:\n"
-                                                   : "Padding or triming the value for binary "
-                                                     "property P:\n"})
-                << c.dflt << " " << c.value;
-        } else {
-            EXPECT_TRUE(warnings.empty()) << c.dflt << " " << c.value;
-        }
+        text += OfferLine(std::string(c.type) + " " + c.dflt + " " + c.value,
+                          Vdm_Property::NewString("P", c.value));
     }
+    nlwtest::ExpectGolden("properties/vectors", text);
 }
 
 // The table's key is "x_cell", the block's type "X_CELL".
