@@ -45,21 +45,8 @@ TEST_F(VerilogWriterModules, UseLibDirectiveEndsFileAfterChipwide) {
     params_.SetInsert_chipwide(true);
     root_.Dir("verilog/src/timcells");
     root_.File("verilog/src/chipwide.v", "module chipwide;\nendmodule\n");
-    const std::string text = View();
-    const std::string tail = R"(endmodule
-
-
-`ifndef CHIPWIDE
-`define CHIPWIDE
-module chipwide;
-endmodule
-
-`endif
-
-`uselib
-)";
-    ASSERT_GE(text.size(), tail.size());
-    EXPECT_EQ(text.substr(text.size() - tail.size()), tail);
+    nlwtest::ExpectGolden("modules/uselib_after_chipwide",
+                          nlwtest::Replaced(AfterHead(View()), root_.Path(), "<root>"));
 }
 
 TEST_F(VerilogWriterModules, MultipleHierarchyModeWritesOnlyThePreambleFromView) {
