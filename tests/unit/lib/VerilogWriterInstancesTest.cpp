@@ -116,7 +116,7 @@ TEST_F(VerilogWriterInstances, BigEndingMapLeavesOtherCellsAlone) {
     b_.AddTypePinBus(t, "ADDR", NLW_DIR_INPUT, 1, 0);
     b_.AddTypePinBus(t, "DATA", NLW_DIR_OUTPUT, 1, 0);
     Memory("V_RAM", "f");
-    EXPECT_NE(Instances().find(".ADDR({a[1], a[0]}),\n    .DATA({d[1], d[0]})"), std::string::npos);
+    nlwtest::ExpectGolden("instances/functional_cell_not_big_ending", Instances());
 }
 
 TEST_F(VerilogWriterInstances, MacroChildrenAreInstantiatedByPort) {
@@ -126,9 +126,7 @@ TEST_F(VerilogWriterInstances, MacroChildrenAreInstantiatedByPort) {
     b_.Connect(i, b_.AddSignal(top_, "n"));
     Nlw_NlBus* w = b_.AddSignalBus(top_, "w", 1, 0);
     b_.Connect(sub->GetPinByAlias("o[0]"), b_.GetSignalBusMember(w, 0));
-    nlwtest::ExpectGolden("instances/macro_children_are_instantiated_by_port", Instances());
-    EXPECT_NE(AfterHead(View()).find("module sub (\n  i, o\n);\n  input i;\n  output [0 : 1] o;\n"),
-              std::string::npos);
+    nlwtest::ExpectGolden("instances/macro_children_are_instantiated_by_port", AfterHead(View()));
 }
 
 }  // namespace
