@@ -1,6 +1,6 @@
 #!/usr/bin/env bash
 # Gate-level against RTL simulation time in Icarus Verilog on the CPU-like
-# test design (tests/tools/designs/cpu_bus.v, register file, ALU and bus,
+# test design (tests/data/designs/cpu_bus.v, register file, ALU and bus,
 # with W=8): flow/rtl2json, qdb2ver -ism with the timing models, one
 # random-stimulus bench for both, the best of three runs of each. Prints the
 # CPU seconds of each simulation and their ratio.
@@ -19,7 +19,7 @@ out="$(mktemp -d)"
 trap 'rm -rf "$out"' EXIT
 
 [ -x "$build/qdb2ver" ] || cmake --build "$build" -j2 --target qdb2ver >/dev/null
-design="$src/tests/tools/designs/cpu_bus.v"
+design="$src/tests/data/designs/cpu_bus.v"
 lib="$src/tests/tools/lib"
 
 "$src/flow/rtl2json" -P W=8 cpu_bus "$out/cpu.json" "$design" >/dev/null

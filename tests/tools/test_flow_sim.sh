@@ -295,7 +295,7 @@ for file in "$src"/tests/data/designs/*.v; do
     done < <(directives "$file" param)
     pins=""
     if [ -n "$(directive "$file" pins)" ]; then
-        pins="$tools/designs/$(directive "$file" pins)"
+        pins="$src/tests/data/designs/$(directive "$file" pins)"
         options+=(-pins "$pins")
     fi
     if ! "$src/flow/rtl2json" "${options[@]+"${options[@]}"}" -log "$dir/flow.log" "$name" \

@@ -61,19 +61,11 @@ TEST(NetlistWriter, DevkeyWithoutViewUsesAnEmptyPart) {
 }
 
 TEST(NetlistWriter, LoadsTheSimulatablePropertyTable) {
-    TempDir dir;
-    WriteFile(dir / "sim.tbl",
-              "# CELLTYPE PARAM TYPE DEFAULT\n"
-              "X_LUT4   INIT    HV  16'h0000\n"
-              "\n"
-              "X_FF\tINIT\tbl\tFALSE   # trailing comment\r\n"
-              "x_lut4   MODE    S   \"A\"\n"  // same cell type, other case
-              "X_RAM    WIDTH   I   4\n"
-              "X_LUT4   INIT    BV  4'b0000\n"  // a second definition is kept after the first
-              "   # indented comment\n");
     StubNetlistWriter nlw;
     QuietCapture capture;
-    ASSERT_TRUE(nlw.LoadSimPropTable((dir / "sim.tbl").c_str()));
+    // Comments, empty lines, tabs, CRLF; a cell type in another case and a
+    // second definition of a parameter are kept after the first.
+    ASSERT_TRUE(nlw.LoadSimPropTable(NLW_TEST_DATA_DIR "/sim_table.tbl"));
     EXPECT_TRUE(capture.msgs.empty());
     using V = std::vector<std::string>;
     EXPECT_EQ(Dump(nlw), (V{"X_FF:INIT:bl:FALSE", "X_LUT4:INIT:HV:16'h0000", "X_LUT4:MODE:S:\"A\"",
