@@ -12,11 +12,12 @@ restored after every mutation, also when the run is interrupted.
 
 Run it in a worktree of its own: it edits the sources it mutates in place.
 The sample depends only on the seed and the source text, so two runs over
-the same sources with different tests compare their fault-finding power.
+the same sources with different tests compare their fault-finding power; a
+site that a change of the code leaves alone stays in the sample.
 """
 import argparse
 import os
-import random
+import hashlib
 import re
 import subprocess
 import sys
@@ -77,9 +78,16 @@ def sample(seed, count):
     for path in sources():
         for i, kind, old, new in candidates(path):
             sites.append((os.path.relpath(path, ROOT), i, kind, old, new))
-    rng = random.Random(seed)
+    # Each site's rank is a seeded hash of its file, text and kind, not of its
+    # position: a site that an unrelated change leaves alone keeps its rank,
+    # so samples of two versions of the code share their unchanged sites.
     # Twice the count: mutations that do not compile are replaced by the next.
-    return rng.sample(sites, min(len(sites), count * 2)), len(sites)
+    def rank(site):
+        path, _, kind, old, new = site
+        key = "%d|%s|%s|%s|%s" % (seed, path, kind, old.strip(), new.strip())
+        return hashlib.sha256(key.encode()).hexdigest()
+    sites.sort(key=rank)
+    return sites[:count * 2], len(sites)
 
 
 def run(cmd, cwd, timeout):
