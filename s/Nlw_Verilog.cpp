@@ -3,6 +3,7 @@
 #include "Nlw_Verilog.h"
 
 #include <string>
+#include <unordered_map>
 
 #include "Nlw_PcsWriter.h"
 #include "Nlw_PinWriter.h"
@@ -13,6 +14,7 @@
 #include "model/Nlw_Nl.h"
 #include "port/Port.h"
 #include "port/UT.h"
+#include "writers/Nlw_MhfInfoWriter.h"
 
 namespace {
 
@@ -142,14 +144,13 @@ void Nlw_Verilog::WriteVerilogFile() {
 void Nlw_Verilog::WriteVerilogMHFile() {
     NLW_MSG().issueStatus("Writing multiple Verilog netlists for design '%s' ...\n",
                           GetDesignName());
-    const std::string directory = GetOutputDirectory();
     const Port::Stream::Access mode = GetParams()->GetOutputFileMode();
     UT_NCH_CACHE written(false);
     const UT_DARRAY<Nlw_NlBlock*>& macros = GetView()->GetMacros();
     for (size_t i = macros.GetCount(); i-- > 0;) {
         Nlw_NlBlock* block = macros[i];
         if (block == nullptr || !block->IsMacro()) continue;
-        const std::string fileName = directory + block->GetFileBaseName() + ".v";
+        const std::string fileName = GetMHNetlistFileName(block);
         Port::String typeName(block->GetTypeName());
         typeName.MakeUpper();
         UT_NCH_NAME* entry = written.add(typeName.c_str(), 1);
@@ -200,6 +201,43 @@ std::string Nlw_Verilog::GetSdfMHPrefix() const {
     return prefix;
 }
 
+// The file of a module block in multiple-hierarchy mode, whether or not
+// this block is the one that writes it.
+std::string Nlw_Verilog::GetMHNetlistFileName(const Nlw_NlBlock* block) const {
+    return GetOutputDirectory() + block->GetFileBaseName() + ".v";
+}
+
+std::string Nlw_Verilog::GetSdfMHFileName(const Nlw_NlBlock* block) const {
+    return GetSdfMHPrefix() + block->GetFileBaseName() + ".sdf";
+}
+
+bool Nlw_Verilog::GetWritesSdf() const {
+    const Nlw_Params* params = GetParams();
+    return params->GetWriteSdfFile() && UT_STR::_ICompare(params->GetInputFileType(), "qdb") != 0;
+}
+
+// The files of a multiple-hierarchy run by the rules of its drivers: a
+// block's module is in the file of the first block of its type (ignoring
+// case) in the descending walk; every block has its own timing file.
+Nlw_MhfFiles Nlw_Verilog::GetMHFiles() const {
+    Nlw_MhfFiles files;
+    std::unordered_map<std::string, std::string> fileOfType;
+    const bool sdf = GetWritesSdf();
+    const UT_DARRAY<Nlw_NlBlock*>& macros = GetView()->GetMacros();
+    for (size_t i = macros.GetCount(); i-- > 0;) {
+        const Nlw_NlBlock* block = macros[i];
+        if (block == nullptr || !block->IsMacro()) continue;
+        Port::String typeName(block->GetTypeName());
+        typeName.MakeUpper();
+        auto first = fileOfType.emplace(typeName.c_str(), GetMHNetlistFileName(block)).first;
+        files.netlist[block] = first->second;
+        if (sdf) files.timing[block] = GetSdfMHFileName(block);
+    }
+    files.chipwide = GetOutputDirectory() + "chipwide.v";
+    if (GetParams()->GetWriteInstantiatedTimcells()) files.models = GetRootFileName("_ism.v");
+    return files;
+}
+
 std::string Nlw_Verilog::GetAssertionFileName() const {
     const bool formality = UT_STR::ICompare(GetParams()->GetEcnTool(), "formality") == 0;
     return GetRootFileName(formality ? ".svf" : ".vxc");
@@ -213,12 +251,11 @@ void Nlw_Verilog::WriteSdfFile() {
 
 // One timing file per module block, not grouped by type.
 void Nlw_Verilog::WriteSdfMHFile() {
-    const std::string prefix = GetSdfMHPrefix();
     const UT_DARRAY<Nlw_NlBlock*>& macros = GetView()->GetMacros();
     for (size_t i = macros.GetCount(); i-- > 0;) {
         Nlw_NlBlock* block = macros[i];
         if (block == nullptr || !block->IsMacro()) continue;
-        const std::string fileName = prefix + block->GetFileBaseName() + ".sdf";
+        const std::string fileName = GetSdfMHFileName(block);
         // The timing file writer comes later.
         (void)fileName;
     }
@@ -248,8 +285,10 @@ void Nlw_Verilog::WriteAssertionFile() {
 
 void Nlw_Verilog::WriteMHFInfoFile() {
     const std::string fileName = GetRootFileName("_mhf_info.txt");
-    // The hierarchy information writer comes later.
-    (void)fileName;
+    NLW_MSG().issueStatus("Writing hierarchy information file '%s' ...\n", fileName.c_str());
+    Nlw_MhfInfoWriter writer(this, fileName.c_str(), GetParams()->GetOutputFileMode());
+    writer.SetFiles(GetMHFiles());
+    writer.WriteView(GetView(), 0);
 }
 
 void Nlw_Verilog::WritePcsFile() {

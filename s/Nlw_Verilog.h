@@ -5,6 +5,7 @@
 #include "framework/Nlw_NetlistWriter.h"
 
 class Nlw_Writer;
+struct Nlw_MhfFiles;
 
 class Nlw_Verilog : public Nlw_NetlistWriter {
 public:
@@ -73,5 +74,9 @@ private:
     std::string GetSdfFileName() const;
     std::string GetSdfMHPrefix() const;
     std::string GetAssertionFileName() const;
+    std::string GetMHNetlistFileName(const Nlw_NlBlock* block) const;
+    std::string GetSdfMHFileName(const Nlw_NlBlock* block) const;
+    bool GetWritesSdf() const;
+    Nlw_MhfFiles GetMHFiles() const;
     const char* GetDesignName() const;
 };

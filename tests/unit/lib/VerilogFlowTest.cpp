@@ -2,6 +2,7 @@
 // closing notices, observed through the files and messages a run leaves.
 #include <algorithm>
 
+#include "TestFiles.h"
 #include "VerilogWriterTest.h"
 #include "framework/Nlw_Nl_LU.h"
 
@@ -135,15 +136,29 @@ TEST_F(VerilogFlow, MultipleHierarchyWritesOneFilePerModuleType) {
         // nothing; the chipwide file is always written.
         std::vector<std::string> files = {"SUB.v", "chipwide.v", "top.v"};
         if (models) files.push_back("top_ism.v");
+        files.push_back("top_mhf_info.txt");
         EXPECT_EQ(Files(), files);
         const int netlists =
             IndexOf(capture, "Writing multiple Verilog netlists for design 'demo' ...\n");
         EXPECT_GE(netlists, 0);
+        const int modelFile =
+            IndexOf(capture, "Writing Verilog simulation model file '" + dir + "/top_ism.v' ...\n");
         if (models) {
-            EXPECT_GT(IndexOf(capture, "Writing Verilog simulation model file '" + dir +
-                                           "/top_ism.v' ...\n"),
-                      netlists);
+            EXPECT_GT(modelFile, netlists);
         }
+        EXPECT_GT(IndexOf(capture, "Writing hierarchy information file '" + dir +
+                                       "/top_mhf_info.txt' ...\n"),
+                  std::max(netlists, modelFile));
+        // Both blocks name the file that holds their type; the shared files
+        // are listed as written.
+        const std::string info = nlwtest::ReadFile(dir + "/top_mhf_info.txt");
+        std::string tail = "shared\tchipwide\t" + dir + "/chipwide.v\n";
+        if (models) tail += "shared\tmodels\t" + dir + "/top_ism.v\n";
+        tail += "block\ttop\ttop\t" + dir + "/top.v\t-\t-\n";
+        tail += "block\ttop/u1\tsub\t" + dir + "/SUB.v\t-\ttop\n";
+        tail += "block\ttop/u2\tSUB\t" + dir + "/SUB.v\t-\ttop\n";
+        ASSERT_GE(info.size(), tail.size());
+        EXPECT_EQ(info.substr(info.size() - tail.size()), tail);
         for (const std::string& text : capture.Texts(Port_MsgLevel::Status))
             EXPECT_EQ(text.find("Writing Verilog netlist file"), std::string::npos) << text;
     }
