@@ -13,7 +13,8 @@ include(CMakePackageConfigHelpers)
 set(NLW_CMAKE_DIR ${CMAKE_INSTALL_LIBDIR}/cmake/nlw_verilog)
 
 install(TARGETS qdb2ver tessel RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR})
-install(PROGRAMS ${CMAKE_SOURCE_DIR}/flow/rtl2json DESTINATION ${CMAKE_INSTALL_BINDIR})
+install(PROGRAMS ${CMAKE_SOURCE_DIR}/flow/rtl2json ${CMAKE_SOURCE_DIR}/flow/rtl2qdm
+        DESTINATION ${CMAKE_INSTALL_BINDIR})
 install(TARGETS nlw_port nlw_model nlw_framework nlw_writers nlw_reader nlw_verilog
         EXPORT nlw_verilogTargets
         ARCHIVE DESTINATION ${CMAKE_INSTALL_LIBDIR}

@@ -2,6 +2,7 @@
 // drivers.
 #include "Nlw_Verilog.h"
 
+#include <cstdint>
 #include <string>
 #include <unordered_map>
 
@@ -12,8 +13,10 @@
 #include "Nlw_VerilogWriter.h"
 #include "framework/Nlw_Nl_LU.h"
 #include "model/Nlw_Nl.h"
+#include "port/PM.h"
 #include "port/Port.h"
 #include "port/UT.h"
+#include "writers/Nlw_AssertionWriter.h"
 #include "writers/Nlw_MhfInfoWriter.h"
 
 namespace {
@@ -275,12 +278,31 @@ void Nlw_Verilog::WriteVerilogTestFile() {
     writer.WriteView(GetView(), 0);
 }
 
+// One writer per key of the tool's FLOW list, all on the same file. Each
+// writes the whole file, so later passes replace the run's own file: they
+// are given Replace even when the run may only create new files.
 void Nlw_Verilog::WriteAssertionFile() {
     // Without a design map file there is nothing to assert.
     if (GetParams()->GetQdmFileName() == nullptr) return;
+    const std::string qdmName = GetParams()->GetQdmFileName();
+    const bool formality = UT_STR::ICompare(GetParams()->GetEcnTool(), "formality") == 0;
     const std::string fileName = GetAssertionFileName();
-    // The assertion writer comes later.
-    (void)fileName;
+    PM_PIC part("", true, PM_PARTNAME_DEFAULT);
+    PM_DEVKEY devkey(formality ? "Nlw_formality" : "Nlw_conformal", &part, false, true, true);
+    Port::Stream::Access mode = GetParams()->GetOutputFileMode();
+    for (uint16_t index = 0;; ++index) {
+        const char* key = devkey.getstringbykey("FLOW", ",", index, nullptr, 0);
+        if (key == nullptr) break;
+        Port_MsgManData::debugStub("Key : %s\n", key);
+        Port_MsgManData::debugStub("Writing Formality assertion file %s ...%s\n", fileName.c_str(),
+                                   qdmName.c_str());
+        Nlw_AssertionWriter writer(this, &devkey, fileName.c_str(), mode);
+        writer.WriteAFW(GetAnnoVacuums());
+        if (!writer.Close()) break;
+        if (mode != Port::Stream::Memory) mode = Port::Stream::Replace;
+        // The count is 16 bits wide: a longer list ends with its wrap.
+        if (index == UINT16_MAX) break;
+    }
 }
 
 void Nlw_Verilog::WriteMHFInfoFile() {

@@ -15,6 +15,7 @@
 #include "model/Nlw_NlBuilder.h"
 #include "port/Port.h"
 #include "port/UT.h"
+#include "reader/Nlw_DesignMapReader.h"
 #include "reader/Nlw_JsonReader.h"
 #include "reader/Nlw_Prep.h"
 
@@ -192,6 +193,13 @@ int Nlw_RunProgram(Nlw_Program program, int argc, const char* const* argv) {
     StageClock clock;
     if (!Nlw_JsonReader::Load(input.c_str(), readOptions, view, design)) return 2;
     clock.Trace("Reading the design");
+    // The design map names modules as the design file does (before -tm);
+    // it is checked before anything is written, so a bad one leaves no
+    // files behind.
+    std::vector<AnnoVacuum> designMap;
+    if (params.GetQdmFileName() &&
+        !Nlw_DesignMapReader::Load(params.GetQdmFileName(), view, designMap))
+        return 2;
     if (params.GetTopModuleName() && view.GetRootMacro())
         view.GetRootMacro()->GetType()->SetName(view.Intern(params.GetTopModuleName()));
     if (!ApplyModelOptions(cl, view)) return 2;
@@ -201,6 +209,7 @@ int Nlw_RunProgram(Nlw_Program program, int argc, const char* const* argv) {
     writer.SetView(&view);
     writer.SetDesign(design.get());
     writer.SetIsVornixCore(cl.core);
+    writer.GetAnnoVacuums() = std::move(designMap);
     std::unique_ptr<Ldm_TypeLib> typeLib(Nlw_Prep::LoadInstallationData(writer));
     writer.SetTypeLib(typeLib.get());
     Nlw_Prep::PrepareProperties(writer);

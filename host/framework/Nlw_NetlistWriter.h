@@ -47,9 +47,19 @@ struct Nlw_ICaseLess {
 };
 using Nlw_SimPropTable = std::map<Port::String, std::vector<Nlw_Property>*, Nlw_ICaseLess>;
 
-// A record the host's assertion writer receives.
+// A record of what the implementation flow did to a register or net of a
+// module between the RTL and the netlist, read from the design map file; the
+// host's assertion writer turns each into equivalence-checker guidance. The
+// model objects are those of the netlist, so that their written names are
+// taken when the file is written, after the legalizer.
 struct AnnoVacuum {
-    std::string text;
+    enum Kind { Constant, Merged, Renamed };
+    Kind kind = Constant;
+    const Nlw_NlType* module = nullptr;  // the module type holding the register or net
+    std::string original;                // the RTL name, such as "count[3]"
+    char value = '0';                    // Constant: '0' or '1'
+    const Nlw_NlBlock* cell = nullptr;   // Merged, Renamed register: the netlist register
+    const Nlw_NlSignal* net = nullptr;   // Renamed net: the netlist net
 };
 
 class Nlw_NetlistWriter {
