@@ -175,6 +175,51 @@ TEST_F(VerilogFlow, RequestedFilesAreWrittenBesideTheNetlist) {
     EXPECT_EQ(Files(), (std::vector<std::string>{"top.pcs", "top.pin", "top.tv", "top.v"}));
 }
 
+// The guidance file of each tool: one line per record of each FLOW part,
+// every name as the netlist writes it (legalized, then escaped), the
+// files of both tools from the same records; a -w-less run still gets its
+// whole file although every FLOW key writes it.
+TEST_F(VerilogFlow, AssertionFileFollowsTheToolsFlowWithWrittenNames) {
+    ScopedEnv vornix("VORNIX", NLW_SOURCE_SHARE_DIR);
+    params.SetOutputFileMode(Port::Stream::Create);
+    params.SetEcnMode(true);
+    params.SetSimMode(false);
+    params.SetQdmFileName("design.qdm");
+    Nlw_NlBlock* u1 = view.GetRootMacro()->GetChildren()[0];
+    std::vector<AnnoVacuum>& records = nlw.GetAnnoVacuums();
+    records.push_back(
+        {AnnoVacuum::Renamed, view.GetRootMacro()->GetType(), "x-y", '0', nullptr, spaced});
+    records.push_back({AnnoVacuum::Merged, u1->GetType(), "q.r[2]", '0', u1, nullptr});
+    records.push_back({AnnoVacuum::Constant, u1->GetType(), "c", '1', nullptr, nullptr});
+    const struct {
+        const char* tool;
+        const char* file;
+        const char* text;
+    } cases[] = {
+        {"Formality", "top.svf",
+         "# Equivalence guidance for design demo: registers the implementation removed or "
+         "renamed.\n"
+         "guide_register_constant -design {sub} {c} 1\n"
+         "guide_register_merge -design {sub} -from {\\q.r [2]} -to {u1}\n"
+         "guide_name_change -design {top} -type net -from {\\x-y } -to {a_b}\n"},
+        {"other", "top.vxc",
+         "// Equivalence guidance for design demo: registers the implementation removed or "
+         "renamed.\n"
+         "SET REGISTER CONSTANT 1 -MODULE sub -GOLDEN c\n"
+         "SET REGISTER MERGE -MODULE sub -GOLDEN \\q.r [2] -REVISED u1\n"
+         "SET NAME MAP -MODULE top -TYPE net -GOLDEN \\x-y  -REVISED a_b\n"},
+    };
+    for (const auto& c : cases) {
+        SCOPED_TRACE(c.tool);
+        params.SetEcnTool(c.tool);
+        Port_MsgCapture capture;
+        nlw.WriteDesign();
+        EXPECT_TRUE(capture.Texts(Port_MsgLevel::Error).empty());
+        EXPECT_EQ(nlwtest::ReadFile(dir + "/" + c.file), c.text);
+        fs::remove(output);
+    }
+}
+
 TEST_F(VerilogFlow, NothingToWriteWithoutAView) {
     nlw.SetView(nullptr);
     Port_MsgCapture capture;
