@@ -69,6 +69,8 @@ qdb2ver|--ub|warn||'--ub'
 tessel|--ub|warn||'--ub'
 tessel|-ecn conformal|has|top.v|supported equivalence checking tools
 tessel|-ecn other|warn||Equivalence tool 'other'
+tessel|-ecn formality -qdm top.qdm|file|top.svf|
+tessel|-ecn conformal -qdm top.qdm|file|top.vxc|
 tessel|-sim|has|top.v|uses simulation
 tessel|-sta|has|top.pcs|DESIGN#HIERARCHICAL;
 tessel|-sta|has|top.pcs|NET#w?w;
@@ -108,7 +110,7 @@ while IFS='|' read -r prog args check file text; do
     n=$((n + 1))
     dir=$work/row$n
     mkdir -p "$dir"
-    cp "$work/top.json" "$dir/"
+    cp "$work/top.json" "$work/top.qdm" "$dir/"
     case "$args" in -h*) design="" ;; *) design=top.json ;; esac
     # shellcheck disable=SC2086
     (cd "$dir" && "$bin/$prog" $args $design) >"$dir/out.txt" 2>&1
