@@ -5,8 +5,10 @@ PACKAGES := g++ cmake make python3 time libgtest-dev libsimdjson-dev yosys iveri
 JOBS ?= 2
 BUILD := build
 BUILD_ASAN := build-asan
+BUILD_FUZZ := build-fuzz
+FUZZ_SECONDS ?= 60
 
-.PHONY: all deps build demo test test-unit bench clean format
+.PHONY: all deps build demo test test-unit bench clean format fuzz
 
 all: build
 
@@ -39,6 +41,13 @@ test: deps
 	echo "$$(( $${total:-0} - $${failed:-0} )) passed, $${failed:-0} failed"; \
 	exit $$(cat ctest.status)
 
+# The libFuzzer target over the reader and a whole write into memory, run
+# for FUZZ_SECONDS on the example designs; findings in build-fuzz/fuzz-findings.
+fuzz: deps
+	CXX=clang++ cmake -S . -B $(BUILD_FUZZ) -DCMAKE_BUILD_TYPE=RelWithDebInfo -DNLW_FUZZ=ON -DNLW_TESTS=OFF >/dev/null
+	cmake --build $(BUILD_FUZZ) -j$(JOBS) --target nlw_fuzz_design
+	bash tests/fuzz/run_fuzz.sh $(BUILD_FUZZ) $(FUZZ_SECONDS)
+
 bench: build
 	@bash bench/run.sh $(BUILD)
 	@bash bench/run_program.sh $(BUILD) --yosys
@@ -47,4 +56,4 @@ format:
 	clang-format -i host/*/*.h host/*/*.cpp s/*.h s/*.cpp apps/*.cpp apps/common/* tests/unit/*.cpp tests/unit/*/*.cpp 2>/dev/null || true
 
 clean:
-	rm -rf $(BUILD) $(BUILD_ASAN) out
+	rm -rf $(BUILD) $(BUILD_ASAN) $(BUILD_FUZZ) out

@@ -69,8 +69,19 @@ double TextNumber(const char* text) {
     return end == text ? 0 : value;
 }
 
+// A bit vector of the design file (yosys writes integer parameters as 32-bit
+// binary strings, so -5 is 111...1011): its low 32 bits as a signed number,
+// x and z reading 0, as the preparation pass reads them.
+int32_t BitsValue(const Vdm_Property* p) {
+    uint32_t v = 0;
+    for (const char* c = p->GetString(); c && *c; ++c) v = (v << 1) | (*c == '1' ? 1u : 0u);
+    return static_cast<int32_t>(v);
+}
+
 double FloatValue(const Vdm_Property* p) {
     switch (p->GetType()) {
+        case VDM_PROP_BITS:
+            return BitsValue(p);
         case VDM_PROP_FLOAT:
             return p->GetFloat();
         case VDM_PROP_INT:
@@ -95,6 +106,8 @@ int32_t IntValue(const Vdm_Property* p) {
             return p->GetInt32();
         case VDM_PROP_FLOAT:
             return Truncate(p->GetFloat());
+        case VDM_PROP_BITS:
+            return BitsValue(p);
         default:
             return Truncate(TextNumber(p->GetString()));
     }
@@ -102,6 +115,7 @@ int32_t IntValue(const Vdm_Property* p) {
 
 // A text attribute that arrives as a number is written as that number.
 const char* TextValue(const Vdm_Property* p) {
+    if (p->GetType() == VDM_PROP_BITS) return vorform("%d", static_cast<int>(BitsValue(p)));
     if (const char* text = p->GetString()) return text;
     switch (p->GetType()) {
         case VDM_PROP_INT:

@@ -73,8 +73,11 @@ void Nlw_Verilog::WriteDesign() {
     if (Port_Env::GetEnv("NLW_NO_NAMECACHE") == nullptr) {
         Nlw_Nl_SpkCache::MakeSpkCache(GetReservedWords(), true);
         const bool bridge = Port_Env::GetEnv("VOR_NLW_LU_NO_BRIDGEID") == nullptr;
-        Nlw_VerilogLU lu(this, view, bridge, params->GetWriteEscapedNames() != 0, true, true,
-                         false);
+        // Library pins are legalized too: a black box's "A b" or "endmodule"
+        // has no model that could declare it. Legal names stay as they are.
+        Nlw_VerilogLU lu(this, view, bridge, params->GetWriteEscapedNames() != 0, true, true, true);
+        // The device's chipwide module goes beside the design's modules.
+        lu.ReserveTypeName("chipwide");
         lu.Process();
     }
 

@@ -116,6 +116,16 @@ void Nlw_VerilogWriter::WriteView(Nlw_NlView* view, unsigned char /*flag*/) {
 
     if (params->GetWriteInstantiatedTimcells()) {
         Port_MsgManData::debugStub("GetParams()->GetWriteInstantiatedTimcells() \n");
+        // Without the installation's cell library no cell is known as a
+        // library cell, and the file would silently hold no model at all.
+        if (!HasCellModels()) {
+            const char* vornix = params->GetVornix();
+            NLW_MSG().issueError(
+                "The cell models could not be found: '%s' is no usable installation (it needs "
+                "data/cells.dat and verilog/src/%s).\n",
+                vornix && *vornix ? vornix : "(none)",
+                params->GetFuncellMode() ? "funcells" : "timcells");
+        }
         UT_NCH_CACHE modelCache;
         for (size_t i = numMacros; i-- > 0;) {
             Nlw_NlBlock* block = macros[i];

@@ -111,10 +111,23 @@ private:
                                 const NameSet& table);
     // Parameters: the inline or defparam text of one element into line_;
     // false when its type cannot be written.
+    // A parameter text of the preparation pass read back as the typed value
+    // it stands for: vector digits (hexadecimal or binary), a string or a
+    // number; false for any other text.
+    struct RawParam {
+        enum Kind { Hex, Bits, String, Number } kind = String;
+        std::string digits;  // vector digits, or the string's characters
+        const char* literal = "";
+    };
+    static bool DecodeLiteral(const char* text, RawParam& raw);
+    // Appends the typed formatting of a raw value to the line.
+    void AppendRawValue(const RawParam& raw, Vdm_Property* element, Nlw_NlBlock* block);
     bool FormatParam(Vdm_Property* element, Nlw_NlBlock* block, bool typed, bool inlineForm,
                      const char* instance);
     // Cell models.
     void WriteIsmList(Nlw_NlBlock* block, UT_NCH_CACHE& cache);
+    // Whether the installation has a cell library and a model folder.
+    bool HasCellModels() const;
     bool CopyModelFile(const char* libraryName, const char* model);
 
     // Appends " // AKA:<aka>" when also-known-as comments are asked and aka

@@ -19,6 +19,19 @@ void AppendInt(std::string& out, long value) {
     out += std::to_string(value);
 }
 
+// The one-bit literal of a tie-off: 0 and 1, and the reader's 2 for "x" and
+// 3 for "z".
+void AppendTie(std::string& out, const Vdm_Property* tie) {
+    const int value = tie->GetInt32();
+    out += "1'b";
+    if (value == 2)
+        out += 'x';
+    else if (value == 3)
+        out += 'z';
+    else
+        AppendInt(out, value);
+}
+
 }  // namespace
 
 void Nlw_VerilogWriter::WriteComponentInstantiationStatements(Nlw_NlBlock* block) {
@@ -28,7 +41,10 @@ void Nlw_VerilogWriter::WriteComponentInstantiationStatements(Nlw_NlBlock* block
     for (Nlw_NlBlock* child : block->GetChildren()) {
         if (!child || !nlw->IsInstantiatable(child)) continue;
 
-        if (defparamMode && (child->IsTimcell() || child->IsFuncell()))
+        // Every leaf with parameters gets its defparam lines: cells outside
+        // the library (yosys's own, black boxes) are as parametrised as the
+        // library's, and would otherwise fall back to their defaults.
+        if (defparamMode && !child->IsMacro())
             WriteExternalProperties(FindExternalProperties(child->GetDataBlock()), child);
 
         line_ = nlw->Escape(child->GetTypeName(), 0);
@@ -110,8 +126,8 @@ void Nlw_VerilogWriter::WritePortMaps(Nlw_NlBlock* instance, int written) {
             separator();
             line_ = '.';
             line_ += nlw->Escape(pin.GetWritableName(), 0);
-            line_ += "(1'b";
-            AppendInt(line_, tie->GetInt32());
+            line_ += '(';
+            AppendTie(line_, tie);
             line_ += ')';
             WriteI(line_.c_str());
         }
@@ -131,7 +147,8 @@ void Nlw_VerilogWriter::WritePortMaps(Nlw_NlBlock* instance, int written) {
             const char* busName = bus->GetWritableName();
             line_ = '.';
             line_ += nlw->Escape(busName, 0);
-            bool first = true;
+            const size_t head = line_.size();
+            bool first = true, anyBit = false;
             while (bus->HasMore(tuple_)) {
                 line_ += first ? "({" : ", ";
                 first = false;
@@ -142,17 +159,24 @@ void Nlw_VerilogWriter::WritePortMaps(Nlw_NlBlock* instance, int written) {
                 if (bit && bit->GetSignal()) {
                     Nlw_NlSignal* signal = bit->GetSignal();
                     line_ += nlw->Escape(signal->GetWritableName(), signal->IsBused() ? 1 : 0);
+                    anyBit = true;
                 } else if (bit && (tie = TieOff(bit))) {
-                    line_ += "1'b";
-                    AppendInt(line_, tie->GetInt32());
+                    AppendTie(line_, tie);
+                    anyBit = true;
                 } else {
-                    // No net and no constant: the bit is left floating; an empty
-                    // element would not be legal Verilog.
+                    // No net and no constant: the bit floats. The reader gives
+                    // open bits of an output a net of their own when other
+                    // bits are connected; here only an input can be left.
                     line_ += "1'bz";
                 }
                 bus->Next(tuple_, dimensions - 1);
             }
-            // A bus without bits is left unconnected.
+            // A bus without any connected bit is left unconnected: a list of
+            // constants would not be legal on an output.
+            if (!anyBit) {
+                line_.resize(head);
+                first = true;
+            }
             line_ += first ? "()" : "})";
             WriteI(line_.c_str());
         }

@@ -79,6 +79,16 @@ void Nlw_VerilogWriter::WriteChipwideModule() {
     if (blackBox) WriteIL("// synthesis translate_on");
 }
 
+bool Nlw_VerilogWriter::HasCellModels() const {
+    if (Port_Env::GetDataFileName("cells.dat", 0) == nullptr) return false;
+    const std::string models =
+        std::string("verilog/src/") + (GetParams()->GetFuncellMode() ? "funcells" : "timcells");
+    const Port::PathList& roots = Port::VornixPath::GetInstance();
+    for (size_t i = 0; i < roots.size(); ++i)
+        if (Port::File::isdir((std::string(roots[i]) + "/" + models).c_str())) return true;
+    return false;
+}
+
 bool Nlw_VerilogWriter::CopyModelFile(const char* libraryName, const char* model) {
     std::string relative = "verilog/src/";
     relative += libraryName;

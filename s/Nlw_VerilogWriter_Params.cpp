@@ -1,7 +1,10 @@
 // Cell parameters: which properties are written, how each is formatted
 // (inline "#( ... )" list or defparam statements), and whether a string is a
 // hexadecimal or a bit-string literal.
+#include <cctype>
+#include <cstdlib>
 #include <cstring>
+#include <string>
 
 #include "Nlw_VerilogWriter.h"
 #include "framework/Nlw_Params.h"
@@ -32,7 +35,110 @@ void AppendUpperStringLiteral(std::string& out, const char* text) {
     out += '"';
 }
 
+bool IsDigitOf(char c, bool hex) {
+    c = static_cast<char>(std::tolower(static_cast<unsigned char>(c)));
+    return c == '0' || c == '1' || c == 'x' || c == 'z' ||
+           (hex && ((c >= '2' && c <= '9') || (c >= 'a' && c <= 'f')));
+}
+
+// Hexadecimal digits as bits, four per digit; x and z stay x and z.
+std::string HexToBits(const std::string& hex) {
+    std::string bits;
+    for (char c : hex) {
+        const char l = static_cast<char>(std::tolower(static_cast<unsigned char>(c)));
+        if (l == 'x' || l == 'z') {
+            bits.append(4, l);
+            continue;
+        }
+        const int v = l <= '9' ? l - '0' : l - 'a' + 10;
+        for (int k = 3; k >= 0; --k) bits += ((v >> k) & 1) ? '1' : '0';
+    }
+    return bits;
+}
+
+// Bits as hexadecimal digits, padded with zeros on the left to whole digits;
+// a digit holding an x or z bit is x or z.
+std::string BitsToHex(const std::string& bits) {
+    const std::string padded = std::string((4 - bits.size() % 4) % 4, '0') + bits;
+    std::string hex;
+    for (size_t i = 0; i < padded.size(); i += 4) {
+        int v = 0;
+        char unknown = 0;
+        for (size_t k = 0; k < 4; ++k) {
+            const char c =
+                static_cast<char>(std::tolower(static_cast<unsigned char>(padded[i + k])));
+            if (c == 'x' || c == 'z') unknown = unknown ? unknown : c;
+            v = v * 2 + (c == '1');
+        }
+        hex += unknown ? unknown : "0123456789ABCDEF"[v];
+    }
+    return hex;
+}
+
 }  // namespace
+
+bool Nlw_VerilogWriter::DecodeLiteral(const char* text, RawParam& raw) {
+    raw = RawParam();
+    raw.literal = text;
+    const std::string t = text;
+    const size_t tick = t.find('\'');
+    if (tick != std::string::npos && tick > 0 && tick + 2 < t.size() &&
+        t.find_first_not_of("0123456789") == tick) {
+        const char radix = static_cast<char>(std::tolower(static_cast<unsigned char>(t[tick + 1])));
+        if (radix != 'h' && radix != 'b') return false;
+        raw.digits = t.substr(tick + 2);
+        for (char c : raw.digits)
+            if (!IsDigitOf(c, radix == 'h')) return false;
+        raw.kind = radix == 'h' ? RawParam::Hex : RawParam::Bits;
+        return true;
+    }
+    if (t.size() >= 2 && t.front() == '"' && t.back() == '"') {
+        for (size_t i = 1; i + 1 < t.size(); ++i) {
+            if (t[i] == '\\' && i + 2 < t.size()) ++i;
+            raw.digits += t[i];
+        }
+        raw.kind = RawParam::String;
+        return true;
+    }
+    // A decimal integer or a real, as the preparation pass writes them.
+    char* end = nullptr;
+    std::strtod(text, &end);
+    if (end != text && *end == '\0' && t.find_first_of("0123456789") == t.find_first_not_of("+-")) {
+        raw.kind = RawParam::Number;
+        return true;
+    }
+    return false;
+}
+
+void Nlw_VerilogWriter::AppendRawValue(const RawParam& raw, Vdm_Property* element,
+                                       Nlw_NlBlock* block) {
+    switch (raw.kind) {
+        case RawParam::Hex:
+        case RawParam::Bits: {
+            const bool hexKind = IsHexStringProperty(element, block);
+            const bool bitKind = !hexKind && IsBitStringProperty(element, block);
+            if (hexKind) {
+                const std::string hex =
+                    raw.kind == RawParam::Hex ? raw.digits : BitsToHex(raw.digits);
+                Port_AppendFormat(line_, "%zu'h%s", 4 * hex.size(), hex.c_str());
+            } else if (bitKind) {
+                const std::string bits =
+                    raw.kind == RawParam::Bits ? raw.digits : HexToBits(raw.digits);
+                Port_AppendFormat(line_, "%zu'b%s", bits.size(), bits.c_str());
+            } else {
+                // A vector the device data names neither way keeps its literal.
+                line_ += raw.literal;
+            }
+            break;
+        }
+        case RawParam::String:
+        case RawParam::Number:
+            // Numbers as they stand, and the design's own text in its own
+            // case: string parameters are compared with case.
+            line_ += raw.literal;
+            break;
+    }
+}
 
 unsigned char Nlw_VerilogWriter::IsExternalProperty(Vdm_Property* property, Nlw_NlBlock* block) {
     const unsigned char base = Nlw_Writer::IsExternalProperty(property, block);
@@ -107,6 +213,19 @@ bool Nlw_VerilogWriter::FormatParam(Vdm_Property* element, Nlw_NlBlock* block, b
         line_ += text;
         tail();
         return true;
+    }
+
+    // The preparation pass hands Verilog-ready texts; typed formatting works
+    // on the raw typed values they stand for, so that both formattings give
+    // the same valid value.
+    if (element->GetType() == VDM_PROP_STRING && element->GetString()) {
+        RawParam raw;
+        if (DecodeLiteral(element->GetString(), raw)) {
+            head(name);
+            AppendRawValue(raw, element, block);
+            tail();
+            return true;
+        }
     }
 
     switch (element->GetType()) {

@@ -69,6 +69,24 @@ void Nlw_VerilogWriter::WriteWireAssignments(Nlw_NlBlock* block) {
         Write(input ? pinSide.c_str() : signalSide, 0, 0);
     }
 
+    // Nets the design holds constant (a register bit found constant, say):
+    // the declared wire reads the constant, not z.
+    for (Nlw_NlSignal* signal : block->GetSignals()) {
+        if (!signal || !signal->IsVisible()) continue;
+        const Vdm_Property* constant = signal->GetPropertyByName("NLW_CONSTANT");
+        if (!constant) continue;
+        if (count++ == 0) {
+            WriteIL("assign");
+            UpIndent();
+        } else {
+            WriteL(",");
+        }
+        line_ = nlw->Escape(signal->GetWritableName(), signal->IsBused() ? 1 : 0);
+        const int value = constant->GetInt32();
+        line_ += value == 2 ? " = 1'bx" : value == 1 ? " = 1'b1" : " = 1'b0";
+        WriteI(line_.c_str());
+    }
+
     if (count > 0) {
         WriteL(";");
         DownIndent();

@@ -1,6 +1,9 @@
 // Turns a cell property into the Verilog text of the parameter that the
 // simulation library defines for the cell type.
+#include <cctype>
+#include <cmath>
 #include <cstdint>
+#include <cstdlib>
 #include <string>
 #include <vector>
 
@@ -54,6 +57,24 @@ Port::String MakeVectorText(Nlw_NetlistWriter& nlw, const Nlw_Property& definiti
         nlw.PadOrTrim(digits, value, "0");
     }
     return Port::String(vorform(hex ? "%s'h%s" : "%s'b%s", widthText.c_str(), value.c_str()));
+}
+
+// A value the literal of its kind can hold: hexadecimal ('h') or binary
+// ('b') digits, x and z included, or a finite real ('r').
+bool IsNumberText(const char* text, char kind) {
+    if (*text == '\0') return false;
+    if (kind == 'r') {
+        char* end = nullptr;
+        const double v = std::strtod(text, &end);
+        return *end == '\0' && std::isfinite(v) && !std::isspace(static_cast<unsigned char>(*text));
+    }
+    for (const char* p = text; *p; ++p) {
+        const char c = static_cast<char>(std::tolower(static_cast<unsigned char>(*p)));
+        const bool digit = c == '0' || c == '1' || c == 'x' || c == 'z' ||
+                           (kind == 'h' && ((c >= '2' && c <= '9') || (c >= 'a' && c <= 'f')));
+        if (!digit) return false;
+    }
+    return true;
 }
 
 }  // namespace
@@ -110,12 +131,24 @@ unsigned char Nlw_Verilog::AddIfSimulatableProperty(Nlw_NlBlock* block, Vdm_Prop
                 Port::String upper(value);
                 upper.MakeUpper();
                 text = vorform("\"%s\"", upper.c_str());
-            } else if (TypeIs(*definition, "HV")) {
-                text = MakeVectorText(*this, *definition, name, value, true);
-            } else if (TypeIs(*definition, "BV")) {
-                text = MakeVectorText(*this, *definition, name, value, false);
-            } else if (TypeIs(*definition, "F")) {
-                text = value;
+            } else if (TypeIs(*definition, "HV") || TypeIs(*definition, "BV") ||
+                       TypeIs(*definition, "F")) {
+                const char* kind = TypeIs(*definition, "HV")   ? "hexadecimal"
+                                   : TypeIs(*definition, "BV") ? "binary"
+                                                               : "real";
+                if (!IsNumberText(value, kind[0])) {
+                    // Padding or cutting would turn the text into some other
+                    // value; nothing sound can be written.
+                    NLW_MSG().issueError(
+                        "Instance '%s': parameter %s has the value \"%s\", which is no %s "
+                        "number.\n",
+                        block->GetInstanceName(), definition->GetName().c_str(), value, kind);
+                    return 0;
+                }
+                if (kind[0] == 'r')
+                    text = value;
+                else
+                    text = MakeVectorText(*this, *definition, name, value, kind[0] == 'h');
             } else {
                 NLW_MSG().issueWarning(
                     "Mismatched property type detected - type %s expected for property %s:, "
@@ -129,6 +162,8 @@ unsigned char Nlw_Verilog::AddIfSimulatableProperty(Nlw_NlBlock* block, Vdm_Prop
             NLW_MSG().issueWarning("Invalid property type detected - %s, ignored.\n", name.c_str());
             return 0;
     }
-    list->CreatePropertyString(name.c_str(), text.c_str());
+    // Under the model's own spelling: simulators match parameter names with
+    // case.
+    list->CreatePropertyString(definition->GetName().c_str(), text.c_str());
     return 1;
 }

@@ -57,6 +57,27 @@ std::string ResolveInput(const std::string& name) {
     return name;
 }
 
+// The names -tm and -ti give are written as they stand: each must be one
+// Verilog identifier once escaped, and the top module may not take the name
+// of the device's chipwide module that the netlist holds beside it.
+std::string CheckGivenNames(const Nlw_Params& params) {
+    const std::pair<const char*, const char*> given[] = {{"-tm", params.GetTopModuleName()},
+                                                         {"-ti", params.GetRootInstanceName()}};
+    for (const auto& g : given) {
+        if (!g.second) continue;
+        if (!*g.second) return std::string("Option ") + g.first + " needs a non-empty name.";
+        for (const char* p = g.second; *p; ++p) {
+            const unsigned char c = static_cast<unsigned char>(*p);
+            if (c <= ' ' || c == 0x7f || c == '`')
+                return std::string("Option ") + g.first + " '" + g.second +
+                       "': a name cannot hold blanks, control characters or backticks.";
+        }
+    }
+    if (params.GetTopModuleName() && std::string(params.GetTopModuleName()) == "chipwide")
+        return "Option -tm 'chipwide': that is the name of the device's chipwide module.";
+    return "";
+}
+
 // Traces how long each stage of the run took (debug channel).
 class StageClock {
 public:
@@ -149,6 +170,8 @@ int Nlw_RunProgram(Nlw_Program program, int argc, const char* const* argv) {
         return 0;
     }
     if (!cl.error.empty()) return UsageError(program, cl.error);
+    const std::string nameProblem = CheckGivenNames(cl.params);
+    if (!nameProblem.empty()) return UsageError(program, nameProblem);
 
     Port_MsgManager& messages = Port_MsgManager::Instance();
     messages.SetQuiet(cl.quiet);

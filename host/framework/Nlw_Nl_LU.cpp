@@ -6,6 +6,7 @@
 #include <cstring>
 #include <string_view>
 #include <unordered_map>
+#include <vector>
 
 #include "model/Nlw_NlBuilder.h"
 
@@ -26,8 +27,10 @@ std::string_view KeyOf(std::string_view name) {
 // A blank, tab, line break or other control character inside a name ends an
 // escaped identifier early or breaks the line it stands on, whatever the
 // format's own rules let through (an escaped name's closing blank aside).
+// A backtick is legal in an escaped identifier, but preprocessors read it
+// as the start of a macro name inside one too.
 bool IsBreaking(unsigned char c) {
-    return c <= ' ' || c == 0x7f;
+    return c <= ' ' || c == 0x7f || c == '`';
 }
 
 bool HasBreakingCharacter(std::string_view name) {
@@ -255,10 +258,15 @@ Nlw_Nl_LU::Nlw_Nl_LU(Nlw_NlView* view, bool types, bool names, bool cellPins, bo
     : view_(view), types_(types), names_(names), cellPins_(cellPins), bridge_(bridge) {}
 
 bool Nlw_Nl_LU::Prepare(const char* name, bool isBused, bool keywords, size_t limit,
-                        std::string& out) {
+                        std::string& out, bool formatRule) {
     std::string text;
     bool changed = false;
-    if (!IsLegal(name, isBused)) {
+    // An empty name would be written as nothing at all.
+    if (*name == '\0') {
+        out = "unnamed";
+        return true;
+    }
+    if (formatRule && !IsLegal(name, isBused)) {
         Port::String legal = Legalize(name, isBused);
         if (legal.str() != name) {
             text.swap(legal.str());
@@ -296,10 +304,27 @@ void Nlw_Nl_LU::Process() {
 void Nlw_Nl_LU::ProcessTypes() {
     const bool keywords = Nlw_Nl_SpkCache::IsBuilt();
     Scope scope(keywords);
-    scope.Reserve(view_->GetTypes().size());
-    for (Nlw_NlType* type : view_->GetTypes())
-        if (!type->IsModule()) scope.Take(type->GetName(), nullptr);
+    scope.Reserve(view_->GetTypes().size() + reservedTypes_.size());
+    for (const std::string& reserved : reservedTypes_) scope.Take(reserved.c_str(), nullptr);
+    // Library cell types keep their names, which name their models. A cell
+    // type no model can have (a black box "my cell", an empty name, a name
+    // of 300 000 characters) is made legal and unique like a module type.
     std::string name;
+    std::vector<Nlw_NlType*> renamedCells;
+    for (Nlw_NlType* type : view_->GetTypes()) {
+        if (type->IsModule()) continue;
+        if (Prepare(type->GetName(), false, keywords, kMax, name, false)) {
+            RenameType(type, name, bridge_);
+            renamedCells.push_back(type);
+        } else {
+            scope.Take(type->GetName(), nullptr);
+        }
+    }
+    for (Nlw_NlType* type : renamedCells)
+        if (!scope.Claim(type->GetName(), nullptr, nullptr, kMax, name)) {
+            RenameType(type, name, bridge_);
+            scope.Take(type->GetName(), nullptr);
+        }
     for (Nlw_NlType* type : view_->GetTypes()) {
         if (!type->IsModule()) continue;
         if (Prepare(type->GetName(), false, keywords, kMax, name)) RenameType(type, name, bridge_);
@@ -385,10 +410,10 @@ void Nlw_Nl_LU::ProcessCellPins() {
             def.name = view_->Intern(text.c_str());
         };
         for (Nlw_NlType::PinDef& def : defs)
-            if (Prepare(def.name, def.bus != nullptr, keywords && !def.bus, kMax, name))
+            if (Prepare(def.name, def.bus != nullptr, keywords && !def.bus, kMax, name, false))
                 setDef(def, name);
         for (Nlw_NlPinBus* bus : type->pinBuses_)
-            if (Prepare(bus->GetWritableName(), false, keywords, BusLimit(bus), name))
+            if (Prepare(bus->GetWritableName(), false, keywords, BusLimit(bus), name, false))
                 Rename(bus, name, false);
 
         Scope scope(keywords);

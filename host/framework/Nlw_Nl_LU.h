@@ -49,6 +49,10 @@ public:
     // own inside signal may keep one name. The later object gets "name_N"
     // with the smallest free N. Bus members follow their bus's name.
     void Process();
+    // A module type name the walk keeps free for a module written beside
+    // the design's (the device's chipwide module): a design module of that
+    // name is renamed.
+    void ReserveTypeName(const char* name) { reservedTypes_.insert(name); }
 
     // The longest name the walk leaves; a bus name leaves room for the
     // index of its members.
@@ -66,10 +70,15 @@ protected:
     bool bridge_ = true;
 
 private:
+    std::unordered_set<std::string> reservedTypes_;
     // The format's legal form of a name, escaped when it is a keyword (and
     // keywords is set) and names are escaped, and shortened to limit. True
-    // with the new name in out when the name changes.
-    bool Prepare(const char* name, bool isBused, bool keywords, size_t limit, std::string& out);
+    // with the new name in out when the name changes. Without formatRule the
+    // format's own rule is not asked: names of library cells and their pins
+    // are written escaped whatever the setting, and only what no escaped
+    // name can hold (breaking characters, emptiness, length) is changed.
+    bool Prepare(const char* name, bool isBused, bool keywords, size_t limit, std::string& out,
+                 bool formatRule = true);
     void ProcessTypes();
     void ProcessMacro(Nlw_NlBlock* macro);
     void ProcessCellPins();

@@ -6,6 +6,7 @@
 #include <cstring>
 #include <ctime>
 
+#include "framework/Nlw_Nl_LU.h"
 #include "model/Nlw_Nl.h"
 #include "port/PM.h"
 #include "port/Port.h"
@@ -143,6 +144,12 @@ PM_PIC* Nlw_Util::CreatePicSpec(Nlw_NlView* view, bool flag) {
 
 std::string Nlw_Util::CommentText(const char* text) {
     std::string out = text ? text : "";
+    // A comment is one token to some readers: a name of 300 000 characters
+    // overflows their buffers.
+    if (out.size() > Nlw_Nl_LU::kMaxNameLength) {
+        out.resize(2000);
+        out += "...";
+    }
     for (char& c : out) {
         const unsigned char u = static_cast<unsigned char>(c);
         if ((u < ' ' && u != '\t') || u == 0x7f) c = ' ';

@@ -101,11 +101,19 @@ private:
             for (uint32_t i = 0; i < cn.width; ++i) {
                 int32_t outer = pm.refs[cn.bitFirst + i];
                 int32_t inner = cm.refs[p.bitFirst + i];
+                // A constant crosses a port only the way the port carries
+                // values: a module ties the parent's net through an output,
+                // the parent ties the module's net through an input. An
+                // open or constant connection of an output leaves the
+                // module's net as the module drives it, and a constant a
+                // module gives its input inside leaves the parent's net.
+                const bool in = p.dir == NLW_DIR_INPUT || p.dir == NLW_DIR_UNTYPED;
+                const bool out = p.dir != NLW_DIR_INPUT;
                 if (outer >= 0 && inner >= 0)
                     Union(parent.base + uint32_t(outer), child.base + uint32_t(inner));
-                else if (outer >= 0)
+                else if (outer >= 0 && out && inner != kConstZ)
                     Tie(parent.base + uint32_t(outer), inner);
-                else if (inner >= 0)
+                else if (inner >= 0 && in && outer != kConstZ)
                     Tie(child.base + uint32_t(inner), outer);
             }
         }
@@ -179,6 +187,8 @@ private:
                 }
                 signal_[r] = s;
             }
+            MakeConstMembers(b_, m, buses, made_);
+            if (ii == 0) topConsts_ = made_;
         }
         pathStack_.clear();
         path_.clear();
@@ -198,7 +208,9 @@ private:
                     }
                     ref = const_[r];
                 }
-                b_.ConnectChild(root->GetPin(p.BitPos(i)), ConstSignal(b_, root, ref, consts_));
+                if (Nlw_NlSignal* s =
+                        PortConstSignal(b_, root, p, p.bitFirst + i, ref, topConsts_, consts_))
+                    b_.ConnectChild(root->GetPin(p.BitPos(i)), s);
             }
     }
 
@@ -244,6 +256,7 @@ private:
     std::vector<Nlw_NlSignal*> signal_;
     std::unordered_map<uint32_t, Text> topPinName_;
     Nlw_NlSignal* consts_[4] = {nullptr, nullptr, nullptr, nullptr};
+    std::vector<std::pair<uint32_t, Nlw_NlSignal*>> made_, topConsts_;
     std::string path_, name_;
     std::vector<std::pair<int32_t, size_t>> pathStack_;
 };

@@ -37,6 +37,12 @@ const char* ConstName(int32_t ref) {
 }
 
 Text TextPool::Keep(std::string_view s) {
+    // Texts are kept NUL-terminated: a NUL inside would cut the name, and
+    // two names could merge.
+    if (const void* nul = std::memchr(s.data(), '\0', s.size()))
+        Fail("the name or text \"" +
+             std::string(s.substr(0, static_cast<const char*>(nul) - s.data())) +
+             "\\u0000...\" holds a NUL character");
     const size_t need = s.size() + 1;
     if (need > left_) {
         const size_t size = std::max<size_t>(need, size_t(1) << 20);
@@ -193,6 +199,7 @@ bool Run(Design& d, Input& text, Nlw_NlView& view, std::unique_ptr<Nlw_Design>& 
             BuildFlat(d, view);
         else
             BuildUnfolded(d, view);
+        ConnectOpenOutputs(view);
         design = std::make_unique<Nlw_Design>(d.modules[d.top].nameText);
         return true;
     } catch (const ReadError& e) {

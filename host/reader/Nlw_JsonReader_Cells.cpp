@@ -2,6 +2,7 @@
 // reader uses, and their connections checked against the pins of their types.
 #include <cstring>
 #include <string>
+#include <unordered_set>
 
 #include "reader/Nlw_JsonReader_Internal.h"
 
@@ -15,7 +16,10 @@ namespace {
 int DirectionOf(object dirs, bool haveDirs, std::string_view pin) {
     if (!haveDirs) return NLW_DIR_UNTYPED;
     std::string_view s;
-    if (dirs.at_key(pin).get_string().get(s)) return NLW_DIR_UNTYPED;
+    // The pin's name as the file may spell it, with yosys's public mark.
+    if (dirs.at_key(pin).get_string().get(s) &&
+        dirs.at_key("\\" + std::string(pin)).get_string().get(s))
+        return NLW_DIR_UNTYPED;
     if (s == "input") return NLW_DIR_INPUT;
     if (s == "output") return NLW_DIR_OUTPUT;
     if (s == "inout") return NLW_DIR_INOUT;
@@ -46,6 +50,10 @@ uint32_t LeafSlot(Design& d, LibType& lt, uint32_t position, std::string_view pi
         idx = position;
     } else {
         auto it = lt.pinIndex.find(pin);
+        // The library and a black box define every pin their cells have.
+        if (it == lt.pinIndex.end() && (lt.def || lt.blackbox >= 0))
+            Fail(where.Text() + ": cell type '" + lt.name + "' has no pin '" + std::string(pin) +
+                 "'");
         if (it == lt.pinIndex.end())
             return AddPin(lt, pin, DirectionOf(dirs, haveDirs, pin), d.pool);
         idx = it->second;
@@ -134,6 +142,7 @@ void ResolveType(Design& d, std::string_view name, TypeCache& cache, Cell& c) {
 void ReadCells(Design& d, Module& m, object cells) {
     Where where{m.name, {}, {}, {}};
     TypeCache cache;
+    std::unordered_set<std::string_view> cellNames;
     // Room for a typical cell's connections and parameters; what is left
     // over is given back when the module is digested.
     const size_t n = cells.size();
@@ -173,8 +182,9 @@ void ReadCells(Design& d, Module& m, object cells) {
         }
         if (!haveType) Fail(where.Text() + ": missing or bad \"type\"");
         Cell c;
-        c.name = d.pool.Keep(kv.key);
-        ResolveType(d, typeName, cache, c);
+        c.name = d.pool.Keep(PublicName(kv.key));
+        if (!cellNames.insert(c.name).second) Fail(where.Text() + ": given twice");
+        ResolveType(d, PublicName(typeName), cache, c);
         // A leaf's type is its library type until its layout is known.
         const uint32_t base = c.type;
         const bool pad = !c.macro && d.types[base].pad;
@@ -217,8 +227,9 @@ void ReadCells(Design& d, Module& m, object cells) {
                 Conn cn;
                 cn.bitFirst = static_cast<uint32_t>(m.refs.size());
                 cn.width = ReadBits(cv.value, m, where);
-                cn.slot = c.macro ? MacroSlot(d.modules[c.type], position, cv.key, cn.width, where)
-                                  : LeafSlot(d, d.types[base], position, cv.key, cn.width, dirs,
+                const std::string_view pin = PublicName(cv.key);
+                cn.slot = c.macro ? MacroSlot(d.modules[c.type], position, pin, cn.width, where)
+                                  : LeafSlot(d, d.types[base], position, pin, cn.width, dirs,
                                              haveDirs, where);
                 m.conns.push_back(cn);
                 ++position;
@@ -233,8 +244,8 @@ void ReadCells(Design& d, Module& m, object cells) {
             LibType& lt = d.types[base];
             if (haveDirs && !lt.def && lt.blackbox < 0 && dirs.size() != c.connCount) {
                 for (auto dv : dirs)
-                    if (!lt.pinIndex.count(dv.key))
-                        AddPin(lt, dv.key, DirectionOf(dirs, true, dv.key), d.pool);
+                    if (!lt.pinIndex.count(PublicName(dv.key)))
+                        AddPin(lt, PublicName(dv.key), DirectionOf(dirs, true, dv.key), d.pool);
             }
             c.type = FindOrAddVariant(d, base, m, c);
             if (pad) m.ownPads = true;

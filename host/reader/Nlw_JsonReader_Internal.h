@@ -29,6 +29,14 @@ struct ReadError {
 };
 [[noreturn]] void Fail(std::string text);
 
+// yosys marks a public name with a leading backslash; its netlist JSON
+// drops the mark only where the rest is a simple identifier, so "\\1st" in
+// the file is the RTL's \1st and the name is "1st". Internal names begin
+// with "$" and carry no mark.
+inline std::string_view PublicName(std::string_view name) {
+    return name.size() > 1 && name[0] == '\\' ? name.substr(1) : name;
+}
+
 // A NUL-terminated text of the pool (or a literal); never null.
 using Text = const char*;
 
@@ -126,6 +134,16 @@ struct NetName {
     uint8_t flags = 0;  // scalar NameFlags
 };
 
+// A constant bit of a named bus ("bits": [7, 8, "1"]): the bus member is
+// made and assigned the constant, so the declared wire reads what the
+// design says. pos is the bit's place in Module::refs.
+struct ConstMember {
+    int32_t bus = 0;
+    int32_t index = 0;
+    int32_t ref = kConst0;
+    uint32_t pos = 0;
+};
+
 // A net of the top module marked as the global set/reset or tristate.
 struct GlobalNet {
     bool setReset = false;
@@ -157,6 +175,7 @@ struct Module {
     uint32_t numNets = 0;
     std::vector<NetName> nets;
     std::vector<NetBus> buses;
+    std::vector<ConstMember> constMembers;
     std::vector<GlobalNet> globals;
     // Some pad cell at or below this module needs its port's pin name.
     bool padsBelow = false;
@@ -317,6 +336,27 @@ Nlw_NlType* ModuleType(Module& m, Nlw_NlBuilder& b);
 // a net (null for a net tied to a constant).
 void ApplyGlobals(const Module& top, Nlw_NlBuilder& b, Nlw_NlBlock* root,
                   const std::vector<Nlw_NlSignal*>& signals);
+// A constant on a pin of a leaf or module instance: 0, 1 and x on an input
+// (or untyped) pin become its tie-off (TIEOFF 0, 1, 2); an output or inout
+// pin is left unconnected, since Verilog connects those only to nets; z
+// stays unconnected.
+void TieConstant(Nlw_NlBuilder& b, Nlw_NlPin* pin, int32_t ref);
+// The constant members of the module's named buses (buses[k] is the bus
+// made for NetBus k, null when none): each is made and marked
+// "NLW_CONSTANT" (0, 1, 2 for x). Lists them by their place in Module::refs.
+void MakeConstMembers(Nlw_NlBuilder& b, const Module& m, const std::vector<Nlw_NlBus*>& buses,
+                      std::vector<std::pair<uint32_t, Nlw_NlSignal*>>& made);
+// The inside signal of a constant bit (at pos in Module::refs) of port p:
+// none for an input, whose value the module does not read; the port's own
+// constant bus member when there is one; else the global constant signal.
+Nlw_NlSignal* PortConstSignal(Nlw_NlBuilder& b, Nlw_NlBlock* block, const Port& p, uint32_t pos,
+                              int32_t ref,
+                              const std::vector<std::pair<uint32_t, Nlw_NlSignal*>>& members,
+                              Nlw_NlSignal* (&cache)[4]);
+// Gives every open bit of a partly connected output or inout bus of an
+// instance a net of its own ("nlw_open_<k>"), so the bus is written as a
+// list of nets.
+void ConnectOpenOutputs(Nlw_NlView& view);
 // The invisible global signal that stands for a constant port bit.
 Nlw_NlSignal* ConstSignal(Nlw_NlBuilder& b, Nlw_NlBlock* block, int32_t ref,
                           Nlw_NlSignal* (&cache)[4]);
@@ -339,11 +379,10 @@ Nlw_NlBlock* CreateLeafCell(Nlw_NlBuilder& b, const Module& m, const Cell& c, co
             int32_t ref = m.refs[cn.bitFirst + i];
             Nlw_NlSignal* s = ref >= 0 ? net(ref, ref) : nullptr;
             Nlw_NlPin* pin = leaf->GetPin(v.BitPos(cn.slot, i));
-            // "x" and "z" bits stay unconnected.
             if (s)
                 b.Connect(pin, s);
-            else if (ref == kConst0 || ref == kConst1)
-                b.SetTieOff(pin, ref == kConst1 ? 1 : 0);
+            else
+                TieConstant(b, pin, ref);
         }
     }
     AddBlockProperties(m, c, &lt, padPinName, leaf);

@@ -68,8 +68,12 @@ int64_t ReadInt(object o, std::string_view key, int64_t dflt, const Where& where
 void ReadRange(object o, uint32_t width, const Where& where, int32_t& msb, int32_t& lsb) {
     int64_t offset = ReadInt(o, "offset", 0, where);
     bool upto = ReadInt(o, "upto", 0, where) != 0;
+    // Checked before the sum, which could overflow for offsets near 2^63.
+    if (offset < std::numeric_limits<int32_t>::min() ||
+        offset > std::numeric_limits<int32_t>::max())
+        Fail(where.Text() + ": \"offset\" out of range");
     int64_t last = offset + static_cast<int64_t>(width ? width - 1 : 0);
-    if (offset < std::numeric_limits<int32_t>::min() || last > std::numeric_limits<int32_t>::max())
+    if (last > std::numeric_limits<int32_t>::max())
         Fail(where.Text() + ": \"offset\" out of range");
     msb = static_cast<int32_t>(upto ? offset : last);
     lsb = static_cast<int32_t>(upto ? last : offset);
@@ -137,14 +141,16 @@ void ReadPorts(Design& d, Module& m) {
         where.key = kv.key;
         object po = AsObject(kv.value, where, "a port");
         Port p;
-        p.name = d.pool.Keep(kv.key);
+        const std::string_view name = PublicName(kv.key);
+        p.name = d.pool.Keep(name);
         element e;
-        if (!po.at_key("direction").get(e)) p.dir = ReadDirection(e, where);
+        if (po.at_key("direction").get(e)) Fail(where.Text() + ": missing \"direction\"");
+        p.dir = ReadDirection(e, where);
         if (po.at_key("bits").get(e)) Fail(where.Text() + ": missing \"bits\"");
         p.bitFirst = static_cast<uint32_t>(m.refs.size());
         p.width = ReadBits(e, m, where);
         ReadRange(po, p.width, where, p.msb, p.lsb);
-        if (!m.portIndex.emplace(kv.key, static_cast<uint32_t>(m.ports.size())).second)
+        if (!m.portIndex.emplace(name, static_cast<uint32_t>(m.ports.size())).second)
             Fail(where.Text() + ": given twice");
         p.pinPos = m.numPins;
         m.numPins += p.width;
@@ -185,7 +191,7 @@ void ReadChildren(Design& d, Module& m, uint32_t self, std::vector<uint32_t>& st
             Fail(where.Text() + ": missing or bad \"type\"");
         if (type == last) continue;
         last = type;
-        auto it = d.moduleIndex.find(type);
+        auto it = d.moduleIndex.find(PublicName(type));
         if (it == d.moduleIndex.end() || d.modules[it->second].blackbox) continue;
         if (stamp[it->second] == self + 1) continue;
         stamp[it->second] = self + 1;
@@ -379,8 +385,8 @@ void ReadModuleList(Design& d) {
     d.modules.reserve(mods.size());
     for (auto kv : mods) {
         Module m;
-        m.name = kv.key;
-        m.nameText = d.pool.Keep(kv.key);
+        m.name = PublicName(kv.key);
+        m.nameText = d.pool.Keep(m.name);
         if (kv.value.get_object().get(m.json))
             Fail("module '" + std::string(m.name) + "': expected an object");
         if (!d.moduleIndex.emplace(m.name, static_cast<uint32_t>(d.modules.size())).second)
@@ -406,7 +412,7 @@ void DigestModule(Design& d, Module& m) {
             where.key = kv.key;
             object no = AsObject(kv.value, where, "a net");
             NetEntry n;
-            n.name = d.pool.Keep(kv.key);
+            n.name = d.pool.Keep(PublicName(kv.key));
             n.hidden = ReadInt(no, "hide_name", 0, where) != 0;
             element bits;
             if (no.at_key("bits").get(bits)) Fail(where.Text() + ": missing \"bits\"");
@@ -416,7 +422,7 @@ void DigestModule(Design& d, Module& m) {
             Attrs a = ReadNetAttrs(no, d.pool, where);
             n.aka = a.aka;
             n.flags = a.nameFlags;
-            auto pit = m.portIndex.find(kv.key);
+            auto pit = m.portIndex.find(PublicName(kv.key));
             if (pit != m.portIndex.end()) {
                 n.port = static_cast<int32_t>(pit->second);
                 if (*a.pinName) m.ports[pit->second].pinName = a.pinName;

@@ -134,6 +134,20 @@ void NameNets(Module& m, NameScratch& scratch, TextPool& pool) {
             nn.flags = cd.flags;
         }
     }
+
+    // Constant bits of the buses made: 0, 1 and x are assigned, z floats.
+    m.constMembers.clear();
+    for (size_t c = 0; c < cands.size(); ++c) {
+        const int32_t bus = busOf[c];
+        if (bus < 0) continue;
+        const NameCandidate& cd = cands[c];
+        for (uint32_t i = 0; i < cd.width; ++i) {
+            int32_t r = m.refs[cd.bitFirst + i];
+            if (r >= 0 || r == kConstZ) continue;
+            int32_t index = cd.msb >= cd.lsb ? cd.lsb + int32_t(i) : cd.lsb - int32_t(i);
+            m.constMembers.push_back({bus, index, r, cd.bitFirst + i});
+        }
+    }
 }
 
 }  // namespace nlw_json

@@ -62,12 +62,14 @@ private:
                 AddNameFlags(f.signals[n], nn.flags);
             }
         }
+        MakeConstMembers(b_, m, buses_, constMembers_);
         for (const Port& p : m.ports)
             for (uint32_t i = 0; i < p.width; ++i) {
                 int32_t ref = m.refs[p.bitFirst + i];
                 Nlw_NlSignal* s = ref >= 0 ? f.signals[static_cast<size_t>(ref)]
-                                           : ConstSignal(b_, f.block, ref, f.consts);
-                b_.ConnectChild(f.block->GetPin(p.BitPos(i)), s);
+                                           : PortConstSignal(b_, f.block, p, p.bitFirst + i, ref,
+                                                             constMembers_, f.consts);
+                if (s) b_.ConnectChild(f.block->GetPin(p.BitPos(i)), s);
             }
         if (m.padsBelow) InheritPinNames(f, m, parent, via);
     }
@@ -128,8 +130,8 @@ private:
                     Nlw_NlPin* pin = mb->GetPin(p.BitPos(i));
                     if (ref >= 0)
                         b_.Connect(pin, f.signals[size_t(ref)]);
-                    else if (ref == kConst0 || ref == kConst1)
-                        b_.SetTieOff(pin, ref == kConst1 ? 1 : 0);
+                    else
+                        TieConstant(b_, pin, ref);
                 }
             }
             AddBlockProperties(m, c, nullptr, "", mb);
@@ -148,6 +150,7 @@ private:
     Nlw_NlBuilder b_;
     std::deque<Frame> stack_;
     std::vector<Nlw_NlBus*> buses_;
+    std::vector<std::pair<uint32_t, Nlw_NlSignal*>> constMembers_;
 };
 
 }  // namespace

@@ -2,6 +2,7 @@
 // cell's parameters into its external property list.
 #include "reader/Nlw_Prep.h"
 
+#include <algorithm>
 #include <string>
 #include <unordered_map>
 
@@ -24,6 +25,31 @@ void PrepareBlock(Nlw_NetlistWriter& nlw, Nlw_NlBlock* block, const Definitions*
     const std::vector<Vdm_Property*>& props = *block->GetProperties();
     std::unique_ptr<Vdm_Property> list(Vdm_Property::NewList("NLW_EXTERNAL_PROPERTIES"));
     std::string literal;
+    // Per definition, the parameter that sets it: "INITSTATE" and "INIT_BIT"
+    // set "INIT" too, and one model parameter takes one value, so a
+    // parameter of the definition's own name wins over such an alias.
+    std::vector<std::pair<const Nlw_Property*, Vdm_Property*>> chosen;
+    if (defs)
+        for (size_t k = 0; k < count; ++k) {
+            Vdm_Property* p = props[k];
+            const Nlw_Property* def =
+                Nlw_Property::Find(*defs, Nlw_Property::ParameterName(p->GetName()));
+            if (!def) continue;
+            auto same = std::find_if(chosen.begin(), chosen.end(),
+                                     [def](const auto& c) { return c.first == def; });
+            if (same == chosen.end()) {
+                chosen.emplace_back(def, p);
+                continue;
+            }
+            const bool ownName =
+                def->GetName().Compare(p->GetName(), Port::String::IgnoreCase) == 0;
+            Vdm_Property* dropped = ownName ? same->second : p;
+            if (ownName) same->second = p;
+            NLW_MSG().issueWarning(
+                "Instance '%s': parameter %s is left out, %s sets the same model parameter %s.\n",
+                block->GetInstanceName(), dropped->GetName(),
+                (ownName ? p : same->second)->GetName(), def->GetName().c_str());
+        }
     for (size_t k = 0; k < count; ++k) {
         Vdm_Property* p = props[k];
         if (defs) {
@@ -31,6 +57,10 @@ void PrepareBlock(Nlw_NetlistWriter& nlw, Nlw_NlBlock* block, const Definitions*
             const Nlw_Property* def =
                 Nlw_Property::Find(*defs, Nlw_Property::ParameterName(p->GetName()));
             if (!def) continue;
+            if (std::find_if(chosen.begin(), chosen.end(), [def, p](const auto& c) {
+                    return c.first == def && c.second == p;
+                }) == chosen.end())
+                continue;
             std::unique_ptr<Vdm_Property> converted = Nlw_Prep::Convert(*p, def->GetType().c_str());
             nlw.AddIfSimulatableProperty(block, converted ? converted.get() : p, list.get());
         } else if (Nlw_Prep::VerilogLiteral(*p, literal)) {
