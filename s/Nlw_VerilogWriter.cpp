@@ -118,7 +118,7 @@ void Nlw_VerilogWriter::WriteView(Nlw_NlView* view, unsigned char /*flag*/) {
         Port_MsgManData::debugStub("GetParams()->GetWriteInstantiatedTimcells() \n");
         // Without the installation's cell library no cell is known as a
         // library cell, and the file would silently hold no model at all.
-        if (!HasCellModels()) {
+        if (!HasCellModels(view)) {
             const char* vornix = params->GetVornix();
             NLW_MSG().issueError(
                 "The cell models could not be found: '%s' is no usable installation (it needs "

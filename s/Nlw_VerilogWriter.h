@@ -126,8 +126,9 @@ private:
                      const char* instance);
     // Cell models.
     void WriteIsmList(Nlw_NlBlock* block, UT_NCH_CACHE& cache);
-    // Whether the installation has a cell library and a model folder.
-    bool HasCellModels() const;
+    // Whether the installation has a model folder and a cell library (or the
+    // view knows library cells without one).
+    bool HasCellModels(Nlw_NlView* view) const;
     bool CopyModelFile(const char* libraryName, const char* model);
 
     // Appends " // AKA:<aka>" when also-known-as comments are asked and aka

@@ -79,8 +79,17 @@ void Nlw_VerilogWriter::WriteChipwideModule() {
     if (blackBox) WriteIL("// synthesis translate_on");
 }
 
-bool Nlw_VerilogWriter::HasCellModels() const {
-    if (Port_Env::GetDataFileName("cells.dat", 0) == nullptr) return false;
+bool Nlw_VerilogWriter::HasCellModels(Nlw_NlView* view) const {
+    // Without the cell library no cell is known as a library cell.
+    if (Port_Env::GetDataFileName("cells.dat", 0) == nullptr) {
+        bool libraryCell = false;
+        for (Nlw_NlBlock* macro : view->GetMacros())
+            for (Nlw_NlBlock* child : macro->GetChildren())
+                libraryCell = libraryCell || child->IsTimcell() || child->IsFuncell();
+        if (!libraryCell) return false;
+    }
+    // Without any root each model's message says so.
+    if (Port::VornixPath::GetInstance().size() == 0) return true;
     const std::string models =
         std::string("verilog/src/") + (GetParams()->GetFuncellMode() ? "funcells" : "timcells");
     const Port::PathList& roots = Port::VornixPath::GetInstance();

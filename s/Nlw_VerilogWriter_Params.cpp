@@ -220,7 +220,10 @@ bool Nlw_VerilogWriter::FormatParam(Vdm_Property* element, Nlw_NlBlock* block, b
     // the same valid value.
     if (element->GetType() == VDM_PROP_STRING && element->GetString()) {
         RawParam raw;
-        if (DecodeLiteral(element->GetString(), raw)) {
+        // A bare digit string of a vector property is a raw value already.
+        if (DecodeLiteral(element->GetString(), raw) &&
+            (raw.kind != RawParam::Number ||
+             (!IsHexStringProperty(element, block) && !IsBitStringProperty(element, block)))) {
             head(name);
             AppendRawValue(raw, element, block);
             tail();

@@ -410,10 +410,10 @@ void Nlw_Nl_LU::ProcessCellPins() {
             def.name = view_->Intern(text.c_str());
         };
         for (Nlw_NlType::PinDef& def : defs)
-            if (Prepare(def.name, def.bus != nullptr, keywords && !def.bus, kMax, name, false))
+            if (Prepare(def.name, def.bus != nullptr, keywords && !def.bus, kMax, name))
                 setDef(def, name);
         for (Nlw_NlPinBus* bus : type->pinBuses_)
-            if (Prepare(bus->GetWritableName(), false, keywords, BusLimit(bus), name, false))
+            if (Prepare(bus->GetWritableName(), false, keywords, BusLimit(bus), name))
                 Rename(bus, name, false);
 
         Scope scope(keywords);

@@ -74,9 +74,9 @@ private:
     // The format's legal form of a name, escaped when it is a keyword (and
     // keywords is set) and names are escaped, and shortened to limit. True
     // with the new name in out when the name changes. Without formatRule the
-    // format's own rule is not asked: names of library cells and their pins
-    // are written escaped whatever the setting, and only what no escaped
-    // name can hold (breaking characters, emptiness, length) is changed.
+    // format's own rule is not asked: library cell type names are written
+    // escaped whatever the setting, and only what no escaped name can hold
+    // (breaking characters, emptiness, length) is changed.
     bool Prepare(const char* name, bool isBused, bool keywords, size_t limit, std::string& out,
                  bool formatRule = true);
     void ProcessTypes();
