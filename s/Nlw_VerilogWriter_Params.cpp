@@ -190,16 +190,18 @@ bool Nlw_VerilogWriter::FormatParam(Vdm_Property* element, Nlw_NlBlock* block, b
     const char* name = element->GetName();
     line_.clear();
     // The head of the text: ".name ( " inline, "defparam inst.name = " else.
+    // A name that is no simple identifier (a black box's "a-b") is escaped;
+    // every other name stands as it is.
     auto head = [&](const char* paramName) {
         if (inlineForm) {
             line_ += '.';
-            line_ += paramName;
+            line_ += GetNlw()->Escape(paramName, 0);
             line_ += " ( ";
         } else {
             line_ += "defparam ";
             line_ += instance;
             line_ += '.';
-            line_ += paramName;
+            line_ += GetNlw()->Escape(paramName, 0);
             line_ += " = ";
         }
     };

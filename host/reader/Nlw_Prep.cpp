@@ -16,6 +16,17 @@ namespace {
 
 using Definitions = std::vector<Nlw_Property>;
 
+// A simple identifier, or one that escaping keeps whole (no blank, control
+// character or backtick), of a length a reader takes.
+bool IsWritableParameterName(const char* name) {
+    size_t n = 0;
+    for (const char* c = name; *c; ++c, ++n) {
+        const unsigned char u = static_cast<unsigned char>(*c);
+        if (u <= ' ' || u == 0x7f || u == '`') return false;
+    }
+    return n > 0 && n <= 2047;
+}
+
 void PrepareBlock(Nlw_NetlistWriter& nlw, Nlw_NlBlock* block, const Definitions* defs) {
     size_t count = Nlw_JsonReader::GetParameterCount(*block);
     if (count == 0) {
@@ -63,6 +74,13 @@ void PrepareBlock(Nlw_NetlistWriter& nlw, Nlw_NlBlock* block, const Definitions*
                 continue;
             std::unique_ptr<Vdm_Property> converted = Nlw_Prep::Convert(*p, def->GetType().c_str());
             nlw.AddIfSimulatableProperty(block, converted ? converted.get() : p, list.get());
+        } else if (!IsWritableParameterName(p->GetName())) {
+            // Parameter names are written as they stand; this one would
+            // break the statement, and no model can declare it.
+            NLW_MSG().issueError(
+                "Instance '%s': parameter name \"%.200s\" is no Verilog identifier; the "
+                "parameter is left out.\n",
+                block->GetInstanceName(), p->GetName());
         } else if (Nlw_Prep::VerilogLiteral(*p, literal)) {
             list->CreatePropertyString(p->GetName(), literal.c_str());
         }

@@ -126,7 +126,10 @@ def gen(out):
              "u`1": {"type": "", "port_directions": {"A": "input", "Y": "output"},
                      "connections": {"A": [3], "Y": [8]}},
              "nopins": {"type": "$_BUF_", "port_directions": {"A": "input", "Y": "output"},
-                        "connections": {"A": [2], "Y": [9]}}},
+                        "connections": {"A": [2], "Y": [9]}},
+             # Parameter names that must be escaped or cannot be written.
+             "params": {"type": "my cell", "parameters": {"a-b": 1, "c d": 2, LONG: 3},
+                        "connections": {"A b": [3]}}},
             attrs={"top": 1})}})
 
     # Faulty inputs: each is an error naming the file and the object.
