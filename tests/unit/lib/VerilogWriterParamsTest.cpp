@@ -47,11 +47,12 @@ TEST_F(VerilogWriterParams, InlineListStandsBetweenTypeAndInstanceName) {
     nlwtest::ExpectGolden("params/inline", Module(top_));
 }
 
-TEST_F(VerilogWriterParams, DefparamModeWritesStatementsBeforeLibraryCellsOnly) {
+TEST_F(VerilogWriterParams, DefparamModeWritesStatementsBeforeEveryParametrisedLeaf) {
     ScopedEnv defparm("NLW_VERILOG_DEFPARM", "");
     Lut("u1",
         {Vdm_Property::NewString("INIT", "16'h8000"), Vdm_Property::NewString("MODE", "\"FAST\"")});
-    // Neither a timing nor a functional cell: no parameters at all.
+    // Neither a timing nor a functional cell (a black box, a yosys cell):
+    // its parameters all the same, else it would take its defaults.
     Lut("u-2", {Vdm_Property::NewString("INIT", "16'h8000")},
         b_.AddLibraryType("V_OTHER", false, false));
     nlwtest::ExpectGolden("params/defparam", Module(top_));
