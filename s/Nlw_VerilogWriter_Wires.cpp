@@ -69,19 +69,12 @@ void Nlw_VerilogWriter::WriteWireAssignments(Nlw_NlBlock* block) {
         Write(input ? pinSide.c_str() : signalSide, 0, 0);
     }
 
-    // Bits of a named bus that the design holds constant (a register bit
-    // found constant, say) or that carry a net named otherwise: the declared
-    // wire reads what the design says, not z.
-    const std::vector<Nlw_NlSignal*>& signals = block->GetSignals();
-    for (Nlw_NlSignal* signal : signals) {
+    // Nets the design holds constant (a register bit found constant, say):
+    // the declared wire reads the constant, not z.
+    for (Nlw_NlSignal* signal : block->GetSignals()) {
         if (!signal || !signal->IsVisible()) continue;
         const Vdm_Property* constant = signal->GetPropertyByName("NLW_CONSTANT");
-        const Vdm_Property* from = signal->GetPropertyByName("NLW_ASSIGN_FROM");
-        const Nlw_NlSignal* source =
-            from && from->GetInt32() >= 0 && size_t(from->GetInt32()) < signals.size()
-                ? signals[size_t(from->GetInt32())]
-                : nullptr;
-        if (!constant && !source) continue;
+        if (!constant) continue;
         if (count++ == 0) {
             WriteIL("assign");
             UpIndent();
@@ -89,13 +82,8 @@ void Nlw_VerilogWriter::WriteWireAssignments(Nlw_NlBlock* block) {
             WriteL(",");
         }
         line_ = nlw->Escape(signal->GetWritableName(), signal->IsBused() ? 1 : 0);
-        if (constant) {
-            const int value = constant->GetInt32();
-            line_ += value == 2 ? " = 1'bx" : value == 1 ? " = 1'b1" : " = 1'b0";
-        } else {
-            line_ += " = ";
-            line_ += nlw->Escape(source->GetWritableName(), source->IsBused() ? 1 : 0);
-        }
+        const int value = constant->GetInt32();
+        line_ += value == 2 ? " = 1'bx" : value == 1 ? " = 1'b1" : " = 1'b0";
         WriteI(line_.c_str());
     }
 

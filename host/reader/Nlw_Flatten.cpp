@@ -187,16 +187,7 @@ private:
                 }
                 signal_[r] = s;
             }
-            // Borrowed bits name nets of this instance, whose signals exist:
-            // a merged net is named in the highest instance holding it.
-            const uint32_t base = in.base;
-            MakeConstMembers(
-                b_, m, buses,
-                [this, base](int32_t ref) -> Nlw_NlSignal* {
-                    const uint32_t r = Find(base + uint32_t(ref));
-                    return const_[r] ? nullptr : signal_[r];
-                },
-                made_);
+            MakeConstMembers(b_, m, buses, made_);
             if (ii == 0) topConsts_ = made_;
         }
         pathStack_.clear();

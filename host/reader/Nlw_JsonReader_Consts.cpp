@@ -2,7 +2,6 @@
 // are written as legal Verilog that keeps the design's meaning, and nets for
 // the open bits of output buses.
 #include <string>
-#include <unordered_map>
 #include <unordered_set>
 
 #include "reader/Nlw_JsonReader_Internal.h"
@@ -17,28 +16,13 @@ void TieConstant(Nlw_NlBuilder& b, Nlw_NlPin* pin, int32_t ref) {
 }
 
 void MakeConstMembers(Nlw_NlBuilder& b, const Module& m, const std::vector<Nlw_NlBus*>& buses,
-                      const std::function<Nlw_NlSignal*(int32_t)>& net,
                       std::vector<std::pair<uint32_t, Nlw_NlSignal*>>& made) {
     made.clear();
-    std::unordered_map<const Nlw_NlSignal*, int32_t> place;
     for (const ConstMember& c : m.constMembers) {
         Nlw_NlBus* bus = buses[static_cast<size_t>(c.bus)];
         if (!bus) continue;
         Nlw_NlSignal* s = b.GetSignalBusMember(bus, c.index);
-        if (!s || s->GetPropertyByName("NLW_CONSTANT") || s->GetPropertyByName("NLW_ASSIGN_FROM"))
-            continue;
-        if (c.ref >= 0) {
-            Nlw_NlSignal* from = net(c.ref);
-            if (!from || from == s || from->GetParent() != s->GetParent()) continue;
-            if (place.empty()) {
-                const std::vector<Nlw_NlSignal*>& all = s->GetParent()->GetSignals();
-                for (size_t k = 0; k < all.size(); ++k) place.emplace(all[k], int32_t(k));
-            }
-            auto it = place.find(from);
-            if (it != place.end())
-                s->AddProperty(Vdm_Property::NewInt("NLW_ASSIGN_FROM", it->second));
-            continue;
-        }
+        if (!s || s->GetPropertyByName("NLW_CONSTANT")) continue;
         s->AddProperty(Vdm_Property::NewInt("NLW_CONSTANT", c.ref == kConst1   ? 1
                                                             : c.ref == kConstX ? 2
                                                                                : 0));

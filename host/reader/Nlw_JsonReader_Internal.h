@@ -10,7 +10,6 @@
 #include <simdjson.h>
 
 #include <cstdint>
-#include <functional>
 #include <map>
 #include <memory>
 #include <string>
@@ -135,10 +134,9 @@ struct NetName {
     uint8_t flags = 0;  // scalar NameFlags
 };
 
-// A bit of a named bus that another name carries: a constant ("bits": [7,
-// 8, "1"]) or a net that a better name won (ref >= 0, the local net). The
-// bus member is made and assigned the constant or that net, so the declared
-// wire reads what the design says. pos is the bit's place in Module::refs.
+// A constant bit of a named bus ("bits": [7, 8, "1"]): the bus member is
+// made and assigned the constant, so the declared wire reads what the
+// design says. pos is the bit's place in Module::refs.
 struct ConstMember {
     int32_t bus = 0;
     int32_t index = 0;
@@ -343,13 +341,10 @@ void ApplyGlobals(const Module& top, Nlw_NlBuilder& b, Nlw_NlBlock* root,
 // pin is left unconnected, since Verilog connects those only to nets; z
 // stays unconnected.
 void TieConstant(Nlw_NlBuilder& b, Nlw_NlPin* pin, int32_t ref);
-// The constant and borrowed members of the module's named buses (buses[k]
-// is the bus made for NetBus k, null when none): each is made and marked
-// "NLW_CONSTANT" (0, 1, 2 for x), or "NLW_ASSIGN_FROM" with the place of
-// the net's signal (net(ref), null when none) in the block's signal list.
-// Lists the constant ones by their place in Module::refs.
+// The constant members of the module's named buses (buses[k] is the bus
+// made for NetBus k, null when none): each is made and marked
+// "NLW_CONSTANT" (0, 1, 2 for x). Lists them by their place in Module::refs.
 void MakeConstMembers(Nlw_NlBuilder& b, const Module& m, const std::vector<Nlw_NlBus*>& buses,
-                      const std::function<Nlw_NlSignal*(int32_t)>& net,
                       std::vector<std::pair<uint32_t, Nlw_NlSignal*>>& made);
 // The inside signal of a constant bit (at pos in Module::refs) of port p:
 // none for an input, whose value the module does not read; the port's own

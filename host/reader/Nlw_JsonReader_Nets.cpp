@@ -135,8 +135,7 @@ void NameNets(Module& m, NameScratch& scratch, TextPool& pool) {
         }
     }
 
-    // Bits of the buses made that the bus does not name: constants (0, 1
-    // and x are assigned, z floats) and nets named otherwise.
+    // Constant bits of the buses made: 0, 1 and x are assigned, z floats.
     m.constMembers.clear();
     for (size_t c = 0; c < cands.size(); ++c) {
         const int32_t bus = busOf[c];
@@ -144,10 +143,7 @@ void NameNets(Module& m, NameScratch& scratch, TextPool& pool) {
         const NameCandidate& cd = cands[c];
         for (uint32_t i = 0; i < cd.width; ++i) {
             int32_t r = m.refs[cd.bitFirst + i];
-            if (r == kConstZ) continue;
-            if (r >= 0 && winner[size_t(r)] == int32_t(c) && winBit[size_t(r)] == i) continue;
-            // A port's bits are joined to their nets through the port.
-            if (r >= 0 && cd.rank < kClassStep) continue;
+            if (r >= 0 || r == kConstZ) continue;
             int32_t index = cd.msb >= cd.lsb ? cd.lsb + int32_t(i) : cd.lsb - int32_t(i);
             m.constMembers.push_back({bus, index, r, cd.bitFirst + i});
         }

@@ -62,9 +62,7 @@ private:
                 AddNameFlags(f.signals[n], nn.flags);
             }
         }
-        std::vector<Nlw_NlSignal*>& sig = f.signals;
-        MakeConstMembers(
-            b_, m, buses_, [&sig](int32_t ref) { return sig[size_t(ref)]; }, constMembers_);
+        MakeConstMembers(b_, m, buses_, constMembers_);
         for (const Port& p : m.ports)
             for (uint32_t i = 0; i < p.width; ++i) {
                 int32_t ref = m.refs[p.bitFirst + i];

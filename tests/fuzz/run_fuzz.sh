@@ -5,7 +5,7 @@
 # Crashes and sanitizer reports land in BUILD_DIR/fuzz-findings.
 set -eu
 src=$(cd "$(dirname "$0")/../.." && pwd)
-build=$1
+build=$(cd "$1" && pwd)
 seconds=${2:-60}
 shift $(( $# < 2 ? $# : 2 ))
 seeds=$build/fuzz-seeds

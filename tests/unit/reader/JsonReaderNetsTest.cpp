@@ -12,8 +12,7 @@ const std::string kNetsJson = nlwtest::Data("json/nets.json");
 // Nets named by port, then public, then internal name, else nlw_net_<n>; a
 // bus that names none of its bits is not made; buses with the file's
 // indexes; ports on one net share it; constant ports get hidden global
-// signals; constant cell pins are tied, x on an input to x (2); bits of a
-// bus that other names carry borrow their nets (NLW_ASSIGN_FROM); akas
+// signals; constant cell pins are tied, x on an input to x (2); akas
 // from hdlname.
 TEST(JsonReaderNets, NamesConnectsAndTies) {
     Installation inst(DataFiles{{"cells.dat", TestCells()}});
