@@ -5,12 +5,16 @@
 #include <cstdint>
 #include <string>
 #include <unordered_map>
+#include <unordered_set>
+#include <vector>
 
 #include "Nlw_PcsWriter.h"
 #include "Nlw_PinWriter.h"
 #include "Nlw_VerilogLU.h"
 #include "Nlw_VerilogTestWriter.h"
 #include "Nlw_VerilogWriter.h"
+#include "framework/Nlw_FileRun.h"
+#include "framework/Nlw_FileSafety.h"
 #include "framework/Nlw_Nl_LU.h"
 #include "model/Nlw_Nl.h"
 #include "port/PM.h"
@@ -28,6 +32,28 @@ void InitBusSettings() {
     Nlw_NlBus::SetMultiDimensions(false);
     Nlw_NlBus::SetInputDelimiterType(7);
     Nlw_NlBus::SetOutputDelimiterType(4);
+}
+
+// Module files in multiple-hierarchy mode are named after module names that
+// anyone may have written ("../x", "a b/c", "Top" beside "top"): each module
+// type gets a file base name that is safe, portable and unique ignoring case,
+// and apart from the run's own chipwide and model files. The per-module
+// timing files use the same names.
+void AssignModuleFileNames(Nlw_NlView* view, const std::string& outputBase) {
+    std::vector<Nlw_NlType*> types;
+    std::vector<std::string> names;
+    std::unordered_set<Nlw_NlType*> seen;
+    const UT_DARRAY<Nlw_NlBlock*>& macros = view->GetMacros();
+    for (size_t i = macros.GetCount(); i-- > 0;) {
+        Nlw_NlBlock* block = macros[i];
+        if (block == nullptr || !block->IsMacro() || block->GetType() == nullptr) continue;
+        if (!seen.insert(block->GetType()).second) continue;
+        types.push_back(block->GetType());
+        names.push_back(block->GetType()->GetName());
+    }
+    const std::vector<std::string> bases =
+        Nlw_FileSafety::SafeFileNames(names, {"chipwide", outputBase + "_ism"});
+    for (size_t i = 0; i < types.size(); ++i) types[i]->SetFileBaseName(bases[i].c_str());
 }
 
 }  // namespace
@@ -66,6 +92,8 @@ void Nlw_Verilog::WriteDesign() {
         return;
     }
 
+    // Every file of the run goes into place together at the end, or none.
+    Nlw_FileRun run;
     Nlw_NlBus::SetInputDelimiterType(4);
 
     // The environment variables are tested for presence only: an empty value
@@ -80,6 +108,10 @@ void Nlw_Verilog::WriteDesign() {
         lu.ReserveTypeName("chipwide");
         lu.Process();
     }
+
+    if (params->GetMHFMode())
+        AssignModuleFileNames(view,
+                              UT_PATH::GetBase(UT_PATH::InternalPath(GetOutputName()).c_str()));
 
     if (Port_Env::GetEnv("NLW_WRITE_NLWFILE") != nullptr) WriteNlwFile();
 
@@ -103,6 +135,7 @@ void Nlw_Verilog::WriteDesign() {
     }
 
     if (params->GetStaMode()) WritePcsFile();
+    run.Commit();
     PrintInfoMessage();
 }
 
@@ -145,8 +178,9 @@ void Nlw_Verilog::WriteVerilogFile() {
 }
 
 // One file per module type: the first block of a type met in the descending
-// walk writes it, later blocks of the same type (compared ignoring case)
-// write nothing.
+// walk writes it, later blocks of the same type write nothing. Types whose
+// names differ only in case are different modules and get files of their
+// own (AssignModuleFileNames keeps the names apart).
 void Nlw_Verilog::WriteVerilogMHFile() {
     NLW_MSG().issueStatus("Writing multiple Verilog netlists for design '%s' ...\n",
                           GetDesignName());
@@ -157,9 +191,7 @@ void Nlw_Verilog::WriteVerilogMHFile() {
         Nlw_NlBlock* block = macros[i];
         if (block == nullptr || !block->IsMacro()) continue;
         const std::string fileName = GetMHNetlistFileName(block);
-        Port::String typeName(block->GetTypeName());
-        typeName.MakeUpper();
-        UT_NCH_NAME* entry = written.add(typeName.c_str(), 1);
+        UT_NCH_NAME* entry = written.add(block->GetTypeName(), 1);
         if (entry == nullptr || entry->GetCount() != 1) continue;
         Port_MsgManData::debugStub("Writing Verilog netlist '%s' ...\n", fileName.c_str());
         Nlw_VerilogWriter writer(this, fileName.c_str(), mode);
@@ -223,8 +255,8 @@ bool Nlw_Verilog::GetWritesSdf() const {
 }
 
 // The files of a multiple-hierarchy run by the rules of its drivers: a
-// block's module is in the file of the first block of its type (ignoring
-// case) in the descending walk; every block has its own timing file.
+// block's module is in the file of the first block of its type in the
+// descending walk; every block has its own timing file.
 Nlw_MhfFiles Nlw_Verilog::GetMHFiles() const {
     Nlw_MhfFiles files;
     std::unordered_map<std::string, std::string> fileOfType;
@@ -233,9 +265,7 @@ Nlw_MhfFiles Nlw_Verilog::GetMHFiles() const {
     for (size_t i = macros.GetCount(); i-- > 0;) {
         const Nlw_NlBlock* block = macros[i];
         if (block == nullptr || !block->IsMacro()) continue;
-        Port::String typeName(block->GetTypeName());
-        typeName.MakeUpper();
-        auto first = fileOfType.emplace(typeName.c_str(), GetMHNetlistFileName(block)).first;
+        auto first = fileOfType.emplace(block->GetTypeName(), GetMHNetlistFileName(block)).first;
         files.netlist[block] = first->second;
         if (sdf) files.timing[block] = GetSdfMHFileName(block);
     }

@@ -5,11 +5,13 @@
 #include <cstdlib>
 #include <filesystem>
 #include <memory>
+#include <new>
 #include <string>
 #include <vector>
 
 #include "Nlw_HostSteps.h"
 #include "Nlw_MessageStyle.h"
+#include "Nlw_RunFiles.h"
 #include "Nlw_Verilog.h"
 #include "framework/Nlw_Util.h"
 #include "model/Nlw_NlBuilder.h"
@@ -140,9 +142,7 @@ bool ApplyModelOptions(const Nlw_CommandLine& cl, Nlw_NlView& view) {
     return true;
 }
 
-}  // namespace
-
-int Nlw_RunProgram(Nlw_Program program, int argc, const char* const* argv) {
+int RunProgram(Nlw_Program program, int argc, const char* const* argv) {
     std::vector<std::string> args;
     for (int i = 1; i < argc; ++i) args.emplace_back(argv[i]);
     Nlw_CommandLine cl = Nlw_ParseCommandLine(program, args);
@@ -178,6 +178,11 @@ int Nlw_RunProgram(Nlw_Program program, int argc, const char* const* argv) {
     messages.SetDebug(cl.debug);
     Port_MsgManData msg = Port_MsgManData::createObject(ProgramName(program));
     Nlw_Params& params = cl.params;
+    std::string input = ResolveInput(params.GetInputFileName());
+    params.SetInputFileName(input.c_str());
+    params.AddInputFile("block RAM data", cl.bramData.c_str());
+    params.AddInputFile("constraints", cl.qcfFile.c_str());
+    if (!Nlw_CheckRunFiles(params, cl.wrapLog.c_str())) return 2;
     if (params.GetLogFileName() && !messages.OpenLog(params.GetLogFileName())) {
         msg.issueError("Cannot open log file '%s'.\n", params.GetLogFileName());
         return 2;
@@ -203,9 +208,6 @@ int Nlw_RunProgram(Nlw_Program program, int argc, const char* const* argv) {
     const char* vornix = Port_Env::GetEnv("VORNIX");
     const Port::PathList& roots = Port::VornixPath::GetInstance();
     params.SetVornix(vornix ? vornix : roots.size() > 0 ? roots[0] : "");
-
-    std::string input = ResolveInput(params.GetInputFileName());
-    params.SetInputFileName(input.c_str());
 
     KeptView().reset(new Nlw_NlView);
     Nlw_NlView& view = *KeptView();
@@ -247,4 +249,20 @@ int Nlw_RunProgram(Nlw_Program program, int argc, const char* const* argv) {
         messages.GetCount(Port_MsgLevel::Error) + messages.GetCount(Port_MsgLevel::Internal);
     messages.CloseLog();
     return errors > 0 ? 1 : 0;
+}
+
+}  // namespace
+
+int Nlw_RunProgram(Nlw_Program program, int argc, const char* const* argv) {
+    // Memory runs out on a design too large for the machine: said as such,
+    // and no file of the run is left behind (the open run removes its
+    // temporaries as it unwinds).
+    try {
+        return RunProgram(program, argc, argv);
+    } catch (const std::bad_alloc&) {
+        Port_MsgManData::createObject(ProgramName(program))
+            .issueError("Out of memory: the design does not fit in the memory of this machine.\n");
+        Port_MsgManager::Instance().CloseLog();
+        return 2;
+    }
 }

@@ -324,6 +324,7 @@ Nlw_CommandLine Nlw_ParseCommandLine(Nlw_Program program, const std::vector<std:
     std::string out = files.size() > 1 ? Nlw_GivenOutputName(files[1])
                                        : Nlw_DefaultOutputName(files[0], cl.params.GetOutputDir());
     cl.params.SetOutputFileName(out.c_str());
+    cl.params.SetOutputFileNamed(files.size() > 1);
     return cl;
 }
 

@@ -2,8 +2,16 @@
 #pragma once
 
 #include <string>
+#include <vector>
 
 #include "port/Port.h"
+
+// A file the run reads: what it is to the user ("design", "design map",
+// "SDF") and its name as given. No output may land on one.
+struct Nlw_InputFile {
+    std::string role;
+    std::string path;
+};
 
 class Nlw_Params {
 public:
@@ -54,6 +62,9 @@ public:
     // -s: the speed grade, which overrides the part's own; null when not
     // given.
     NLW_TEXT_PARAM(Speed)
+    // The output file name was given on the command line rather than derived
+    // from the input: -w may then replace whatever file is there.
+    NLW_FLAG_PARAM(OutputFileNamed, false)
 
     // Modes.
     NLW_FLAG_PARAM(SimMode, true)
@@ -86,6 +97,14 @@ public:
 #undef NLW_TEXT_PARAM
 #undef NLW_FLAG_PARAM
 
+    // The files the run reads; every output name is checked against them.
+    void AddInputFile(const char* role, const char* path) {
+        if (path && *path) inputs_.push_back({role ? role : "input", path});
+    }
+    const std::vector<Nlw_InputFile>& GetInputFiles() const {
+        return inputs_;
+    }
+
     Port::Stream::Access GetOutputFileMode() const {
         return mode_;
     }
@@ -95,4 +114,5 @@ public:
 
 private:
     Port::Stream::Access mode_ = Port::Stream::Create;
+    std::vector<Nlw_InputFile> inputs_;
 };

@@ -2,6 +2,7 @@
 // renaming into place, and the external property list.
 #include "framework/Nlw_Writer.h"
 
+#include <fcntl.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -9,6 +10,8 @@
 #include <cstdlib>
 #include <cstring>
 
+#include "framework/Nlw_FileRun.h"
+#include "framework/Nlw_FileSafety.h"
 #include "framework/Nlw_NetlistWriter.h"
 #include "model/Nlw_Nl.h"
 #include "model/Vdm_Property.h"
@@ -27,48 +30,89 @@ Nlw_Writer::Nlw_Writer(Nlw_NetlistWriter* nlw, const char* fileName, Port::Strea
         Fail("no file name was given");
         return;
     }
-    if (access_ == Port::Stream::Create && Port::File::exist(fileName_.c_str())) {
-        ok_ = false;
-        NLW_MSG().issueError("Output file '%s' exists; use -w to overwrite it.\n",
-                             fileName_.c_str());
+    Nlw_Params* params = GetParams();
+    if (params &&
+        !Nlw_FileSafety::CheckNotInput(fileName_.c_str(), "Output file", params->GetInputFiles())) {
+        Refuse();
         return;
     }
-    struct stat st;
-    const bool exists = ::stat(fileName_.c_str(), &st) == 0;
-    if (exists && S_ISDIR(st.st_mode)) {
+    struct stat lst, st;
+    const bool present = ::lstat(fileName_.c_str(), &lst) == 0;
+    const bool resolves = present && ::stat(fileName_.c_str(), &st) == 0;
+    if (resolves && S_ISDIR(st.st_mode)) {
         Fail(std::strerror(EISDIR));
         return;
     }
-    if (exists && !S_ISREG(st.st_mode)) {
-        // A device or pipe (/dev/null, a fifo) is written in place: renaming
-        // a file over it would replace the device itself.
-        OpenFile(fileName_);
-        return;
+    if (present) {
+        // Only a file the user named, or one this program wrote, may go;
+        // a dangling link counts as a file that exists.
+        const bool named =
+            !params || (params->GetOutputFileNamed() &&
+                        Nlw_FileSafety::IsSameFile(fileName_.c_str(), params->GetOutputFileName()));
+        if (!named && !(resolves && Nlw_FileSafety::IsOwnFile(fileName_.c_str()))) {
+            NLW_MSG().issueError(
+                "File '%s' exists and was not written by this program; it is left as it "
+                "is. Move it away, or choose another output file name or folder.\n",
+                fileName_.c_str());
+            Refuse();
+            return;
+        }
+        if (access_ == Port::Stream::Create) {
+            NLW_MSG().issueError("Output file '%s' exists; use -w to overwrite it.\n",
+                                 fileName_.c_str());
+            Refuse();
+            return;
+        }
+        if (resolves && !S_ISREG(st.st_mode)) {
+            // A device or pipe (/dev/null, a fifo) is written in place:
+            // renaming a file over it would replace the device itself.
+            int fd = ::open(fileName_.c_str(), O_WRONLY | O_CLOEXEC);
+            if (fd < 0 || !OpenStream(fd)) Fail(std::strerror(errno));
+            return;
+        }
     }
     // A symbolic link keeps pointing at the file: the new text replaces the
-    // file it leads to.
-    struct stat lst;
+    // file it leads to. A dangling one is replaced itself.
     targetName_ = fileName_;
-    if (exists && ::lstat(fileName_.c_str(), &lst) == 0 && S_ISLNK(lst.st_mode)) {
+    if (present && resolves && S_ISLNK(lst.st_mode)) {
         if (char* real = ::realpath(fileName_.c_str(), nullptr)) {
             targetName_ = real;
             std::free(real);
         }
     }
-    std::string temp = targetName_ + ".tmp" + std::to_string(static_cast<long>(::getpid()));
-    if (OpenFile(temp)) tempName_ = temp;
+    std::string temp;
+    int fd = Nlw_TempFile::Create(targetName_, 0666, temp);
+    if (fd < 0) {
+        Fail(std::strerror(errno));
+        return;
+    }
+    tempName_ = temp;
+    // A replaced file keeps its permissions.
+    if (resolves && ::fchmod(fd, st.st_mode & 07777) != 0) {
+        Fail(std::strerror(errno));
+        ::close(fd);
+        return;
+    }
+    if (!OpenStream(fd)) Fail(std::strerror(errno));
 }
 
-bool Nlw_Writer::OpenFile(const std::string& path) {
-    fp_ = std::fopen(path.c_str(), "wb");
+bool Nlw_Writer::OpenStream(int fd) {
+    fp_ = ::fdopen(fd, "wb");
     if (!fp_) {
-        Fail(std::strerror(errno));
+        const int err = errno;
+        ::close(fd);
+        errno = err;
         return false;
     }
     // The writer buffers in large blocks itself; unbuffered stdio makes every
     // write error show at the fwrite that caused it.
     std::setvbuf(fp_, nullptr, _IONBF, 0);
     return true;
+}
+
+void Nlw_Writer::Refuse() {
+    ok_ = false;
+    if (Nlw_FileRun* run = Nlw_FileRun::Current()) run->MarkFailed();
 }
 
 Nlw_Writer::~Nlw_Writer() {
@@ -100,11 +144,11 @@ Nlw_Writer& Nlw_Writer::operator=(const Nlw_Writer& other) {
 
 void Nlw_Writer::Fail(const char* what) {
     if (!ok_) return;  // one message per file
-    ok_ = false;
+    Refuse();
     NLW_MSG().issueError("Cannot write file '%s': %s\n", fileName_.c_str(), what);
     if (fp_) std::fclose(fp_);
     fp_ = nullptr;
-    if (!tempName_.empty()) std::remove(tempName_.c_str());
+    Nlw_TempFile::Remove(tempName_);
     tempName_.clear();
     buffer_.clear();
     buffer_.shrink_to_fit();
@@ -135,19 +179,27 @@ bool Nlw_Writer::Close() {
         return false;
     }
     if (tempName_.empty()) return true;  // written in place
-    // Someone may have made the file since the writer was opened.
-    if (access_ == Port::Stream::Create && Port::File::exist(fileName_.c_str())) {
-        std::remove(tempName_.c_str());
+    const bool createOnly = access_ == Port::Stream::Create;
+    // In a run, the file goes into place with all the others.
+    if (Nlw_FileRun* run = Nlw_FileRun::Current()) {
+        run->Add(fileName_, tempName_, targetName_, createOnly);
+        tempName_.clear();
+        return true;
+    }
+    const int err = Nlw_TempFile::Place(tempName_, targetName_, createOnly);
+    if (err == EEXIST && createOnly) {
+        Nlw_TempFile::Remove(tempName_);
         tempName_.clear();
         ok_ = false;
         NLW_MSG().issueError("Output file '%s' exists; use -w to overwrite it.\n",
                              fileName_.c_str());
         return false;
     }
-    if (std::rename(tempName_.c_str(), targetName_.c_str()) != 0) {
-        Fail(std::strerror(errno));
+    if (err != 0) {
+        Fail(std::strerror(err));
         return false;
     }
+    Nlw_TempFile::Forget(tempName_);
     tempName_.clear();
     return true;
 }

@@ -39,12 +39,16 @@ private:
 class Nlw_Writer {
 public:
     // Opens fileName for writing in the access mode. Text goes to a temporary
-    // file beside it ("<fileName>.tmp<pid>"), renamed into place when the
-    // writer is closed after every write succeeded; until then an old file
-    // of that name stays as it was. With Create, an existing file is an error
-    // and is kept. Failures are reported as one error naming the file and the
-    // reason; the writer then discards what it is given and leaves no file
-    // behind. Memory collects the text for GetMemoryText and opens no file.
+    // file beside it ("<fileName>.tmp<pid>", created exclusively), renamed
+    // into place when the writer is closed after every write succeeded, or,
+    // while an Nlw_FileRun is open, when the run is committed; until then an
+    // old file of that name stays as it was. With Create, an existing file is
+    // an error and is kept. A name that is one of the run's inputs, or an
+    // existing file the user did not name and this program did not write, is
+    // refused in both modes. Failures are reported as one error naming the
+    // file and the reason; the writer then discards what it is given, leaves
+    // no file behind and fails the open run. Memory collects the text for
+    // GetMemoryText and opens no file.
     Nlw_Writer(Nlw_NetlistWriter* nlw, const char* fileName, Port::Stream::Access access);
     virtual ~Nlw_Writer();
     // A copy shares the owner, the property filter, the file name and the
@@ -101,7 +105,8 @@ private:
     void AppendIndent();
     void Flush();
     void Fail(const char* what);
-    bool OpenFile(const std::string& path);
+    void Refuse();
+    bool OpenStream(int fd);
 
     Nlw_NetlistWriter* nlw_ = nullptr;
     Vdh_PropOutFilter* filter_ = nullptr;

@@ -268,6 +268,10 @@ public:
     int GetPrimType() const { return primType_; }
     void SetName(const char* name);
     void SetAka(const char* aka);
+    // The base name of a module type's own files: its name until the writer
+    // gives it a file-safe one.
+    const char* GetFileBaseName() const { return fileBase_ ? fileBase_ : name_; }
+    void SetFileBaseName(const char* base);
 
     // Pin definitions of a library cell type, in pin order.
     struct PinDef {
@@ -291,6 +295,7 @@ private:
     Nlw_NlType() = default;
     const char* name_ = "";
     const char* aka_ = nullptr;
+    const char* fileBase_ = nullptr;
     Nlw_NlView* view_ = nullptr;
     bool isModule_ = false;
     bool timcell_ = false;
@@ -320,7 +325,7 @@ public:
     bool IsTimcell() const;
     bool IsFuncell() const;
     int GetPrimType() const;
-    // The base name of the block's own files (a module's type name).
+    // The base name of the block's own files (its type's file base name).
     const char* GetFileBaseName() const;
     // The block's data-model object, which carries its properties.
     Vdm_PropertyHolder* GetDataBlock() { return this; }

@@ -27,7 +27,7 @@ int Nlw_NlBlock::GetPrimType() const {
     return type_ ? type_->GetPrimType() : 0;
 }
 const char* Nlw_NlBlock::GetFileBaseName() const {
-    return GetTypeName();
+    return type_ ? type_->GetFileBaseName() : "";
 }
 
 const UT_DARRAY<Nlw_NlPinBus*>* Nlw_NlBlock::GetPinBuses() const {

@@ -125,6 +125,10 @@ void Nlw_NlType::SetAka(const char* aka) {
     aka_ = aka ? view_->Intern(aka) : nullptr;
 }
 
+void Nlw_NlType::SetFileBaseName(const char* base) {
+    fileBase_ = base ? view_->Intern(base) : nullptr;
+}
+
 int Nlw_NlType::FindPinDef(const char* name) const {
     if (name == nullptr) return -1;
     const std::string_view key(name);

@@ -154,8 +154,9 @@ public:
     // the next calls). Returns 0 at the end of the file, and when size is
     // below 2, 1 otherwise.
     int readline(char* buffer, int size);
-    // Reads the next whole line, whatever its length, without its line end.
-    // Returns false at the end.
+    // Reads the next whole line without its line end. Returns false at the
+    // end, and for a line longer than File::kMaxLine, which is reported as
+    // an error naming the file and line and ends the reading.
     bool readline(std::string& line);
     void close();
 
@@ -171,6 +172,8 @@ private:
     std::vector<char> buf_;
     size_t pos_ = 0;
     size_t len_ = 0;
+    std::string path_;  // for messages
+    size_t lineNo_ = 0;
 };
 
 class File {
@@ -178,10 +181,17 @@ public:
     static bool exist(const char* path);
     static bool isdir(const char* path);
     // Opens a file for reading into stream. Returns false when it cannot
-    // (a directory cannot be opened).
+    // (a directory cannot be opened). Installation data is read through
+    // here: only a regular file of at most kMaxDataSize bytes is opened
+    // (never waiting on a fifo); any other is reported as an error naming
+    // it, so that a link to /dev/zero cannot make a run grow without end.
     static bool open(const char* path, Stream& stream, int flag = 0);
-    // Reads a whole file. Returns false (and sets error) when it cannot.
+    // Reads a whole file, with the same limits. Returns false (and sets
+    // error) when it cannot.
     static bool readAll(const char* path, std::string& content, std::string* error = nullptr);
+
+    static constexpr size_t kMaxDataSize = size_t(64) << 20;
+    static constexpr size_t kMaxLine = size_t(1) << 20;
 };
 
 class FileName {

@@ -1,4 +1,5 @@
 // Files, streams, path names, the installation roots and the environment.
+#include <fcntl.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -101,9 +102,15 @@ int Stream::readline(char* buffer, int size) {
 bool Stream::readline(std::string& line) {
     line.clear();
     if (!fp_ || Peek() == EOF) return false;
+    ++lineNo_;
+    bool atEnd = false;
     for (;;) {
+        if (line.size() > File::kMaxLine) break;
         // Copy runs of ordinary characters straight from the buffer.
-        if (pos_ == len_ && !Fill()) return true;  // the last line has no line end
+        if (pos_ == len_ && !Fill()) {
+            atEnd = true;  // the last line has no line end
+            break;
+        }
         const char* start = buf_.data() + pos_;
         const char* end = buf_.data() + len_;
         const char* nl = static_cast<const char*>(std::memchr(start, '\n', end - start));
@@ -116,7 +123,14 @@ bool Stream::readline(std::string& line) {
         pos_ += static_cast<size_t>(nl - start) + 1;
         break;
     }
-    if (!line.empty() && line.back() == '\r') line.pop_back();
+    if (line.size() > File::kMaxLine) {
+        NLW_MSG().issueError("Cannot read file '%s': line %zu is longer than %zu bytes.\n",
+                             path_.c_str(), lineNo_, File::kMaxLine);
+        close();
+        line.clear();
+        return false;
+    }
+    if (!atEnd && !line.empty() && line.back() == '\r') line.pop_back();
     return true;
 }
 
@@ -132,12 +146,60 @@ bool File::isdir(const char* path) {
     return path && *path && ::stat(path, &st) == 0 && S_ISDIR(st.st_mode);
 }
 
+namespace {
+
+// Opens path for reading when it is a regular file of at most the data size
+// limit; a fifo does not stall the open. Returns the descriptor, or -1 with
+// reason set; refused tells a file that exists but may not be read (as
+// opposed to one that is missing or unreadable).
+int OpenData(const char* path, std::string& reason, bool& refused) {
+    refused = false;
+    int fd = ::open(path, O_RDONLY | O_CLOEXEC | O_NONBLOCK);
+    if (fd < 0) {
+        reason = std::strerror(errno);
+        return -1;
+    }
+    struct stat st;
+    if (::fstat(fd, &st) != 0) {
+        reason = std::strerror(errno);
+    } else if (S_ISDIR(st.st_mode)) {
+        reason = std::strerror(EISDIR);
+    } else if (!S_ISREG(st.st_mode)) {
+        reason = "not a regular file";
+        refused = true;
+    } else if (static_cast<unsigned long long>(st.st_size) > File::kMaxDataSize) {
+        reason = "larger than the limit of " + std::to_string(File::kMaxDataSize >> 20) +
+                 " MiB for installation data";
+        refused = true;
+    } else {
+        ::fcntl(fd, F_SETFL, ::fcntl(fd, F_GETFL) & ~O_NONBLOCK);
+        return fd;
+    }
+    ::close(fd);
+    return -1;
+}
+
+}  // namespace
+
 bool File::open(const char* path, Stream& stream, int flag) {
     (void)flag;
     stream.close();
-    if (!path || isdir(path)) return false;
-    stream.fp_ = std::fopen(path, "rb");
-    return stream.fp_ != nullptr;
+    if (!path) return false;
+    std::string reason;
+    bool refused;
+    int fd = OpenData(path, reason, refused);
+    if (fd < 0) {
+        if (refused) NLW_MSG().issueError("Cannot read file '%s': %s.\n", path, reason.c_str());
+        return false;
+    }
+    stream.fp_ = ::fdopen(fd, "rb");
+    if (!stream.fp_) {
+        ::close(fd);
+        return false;
+    }
+    stream.path_ = path;
+    stream.lineNo_ = 0;
+    return true;
 }
 
 bool File::readAll(const char* path, std::string& content, std::string* error) {
@@ -146,23 +208,33 @@ bool File::readAll(const char* path, std::string& content, std::string* error) {
         if (error) *error = "no file name";
         return false;
     }
-    if (isdir(path)) {
-        if (error) *error = std::strerror(EISDIR);
-        return false;
-    }
-    FILE* fp = std::fopen(path, "rb");
-    if (!fp) {
-        if (error) *error = std::strerror(errno);
+    std::string reason;
+    bool refused;
+    int fd = OpenData(path, reason, refused);
+    if (fd < 0) {
+        if (error) *error = reason;
         return false;
     }
     char chunk[65536];
-    size_t n;
-    while ((n = std::fread(chunk, 1, sizeof chunk, fp)) > 0) content.append(chunk, n);
-    bool ok = !std::ferror(fp);
-    int err = errno;
-    std::fclose(fp);
-    if (!ok && error) *error = std::strerror(err);
-    return ok;
+    for (;;) {
+        ssize_t n = ::read(fd, chunk, sizeof chunk);
+        if (n == 0) break;
+        if (n < 0) {
+            if (errno == EINTR) continue;
+            if (error) *error = std::strerror(errno);
+            ::close(fd);
+            return false;
+        }
+        content.append(chunk, static_cast<size_t>(n));
+        if (content.size() > kMaxDataSize) {  // it grew while being read
+            if (error) *error = "larger than the limit for installation data";
+            ::close(fd);
+            content.clear();
+            return false;
+        }
+    }
+    ::close(fd);
+    return true;
 }
 
 // ---- FileName ------------------------------------------------------------

@@ -40,6 +40,9 @@ public:
     size_t size() const { return cells_.size(); }
     const std::vector<Nlw_CellDef>& GetCells() const { return cells_; }
 
+    // The widest bus pin a cell may have (2^24 bits).
+    static constexpr int64_t kMaxBusWidth = int64_t(1) << 24;
+
 private:
     std::vector<Nlw_CellDef> cells_;
     std::unordered_map<std::string, size_t> index_;

@@ -4,7 +4,6 @@
 #include "reader/Nlw_JsonReader.h"
 
 #include <fcntl.h>
-#include <sys/mman.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -75,88 +74,67 @@ void Design::ReleaseDocument() {
 namespace {
 
 // The text of a file followed by the padding the parser may read past its
-// end. A regular file is mapped rather than copied: the pages come straight
-// from the file cache, which saves a copy and fresh memory of the file's
-// size.
+// end. The file is read, not mapped: a mapped file that someone truncates
+// while it is parsed ends the process with SIGBUS, a read one gives an
+// error. Only a regular file is read, so that its size is known before and
+// checked after: /dev/zero or a fifo cannot make the load grow without end.
 class Input {
 public:
-    Input() = default;
-    Input(const Input&) = delete;
-    Input& operator=(const Input&) = delete;
-    ~Input() { Release(); }
-
     bool ReadFile(const char* fileName, std::string& reason) {
-        int fd = ::open(fileName, O_RDONLY | O_CLOEXEC);
+        int fd = ::open(fileName, O_RDONLY | O_CLOEXEC | O_NONBLOCK);
         if (fd < 0) {
             reason = std::strerror(errno);
             return false;
         }
-        struct stat st;
-        bool ok;
-        if (::fstat(fd, &st) != 0) {
-            reason = std::strerror(errno);
-            ok = false;
-        } else if (S_ISDIR(st.st_mode)) {
-            reason = std::strerror(EISDIR);
-            ok = false;
-        } else {
-            ok = (S_ISREG(st.st_mode) && st.st_size > 0 && Map(fd, size_t(st.st_size))) ||
-                 ReadAll(fd, reason);
-        }
+        bool ok = Read(fd, reason);
         ::close(fd);
         return ok;
     }
 
     void Copy(const std::string& text) { copy_ = simdjson::padded_string(text); }
 
-    const char* data() const { return map_ ? static_cast<const char*>(map_) : copy_.data(); }
-    size_t size() const { return map_ ? size_ : copy_.size(); }
-
-    void Release() {
-        if (map_) ::munmap(map_, mapLength_);
-        map_ = nullptr;
-        copy_ = simdjson::padded_string();
-    }
+    const char* data() const { return copy_.data(); }
+    size_t size() const { return copy_.size(); }
+    void Release() { copy_ = simdjson::padded_string(); }
 
 private:
-    bool Map(int fd, size_t size) {
-        const size_t page = static_cast<size_t>(::sysconf(_SC_PAGESIZE));
-        const size_t length = (size + simdjson::SIMDJSON_PADDING + page - 1) / page * page;
-        // Zero pages over the whole length first, then the file over its
-        // start: the padding after the file reads as zeros.
-        void* base = ::mmap(nullptr, length, PROT_READ, MAP_PRIVATE | MAP_ANONYMOUS, -1, 0);
-        if (base == MAP_FAILED) return false;
-        void* file = ::mmap(base, size, PROT_READ, MAP_PRIVATE | MAP_FIXED | MAP_POPULATE, fd, 0);
-        if (file == MAP_FAILED) {
-            ::munmap(base, length);
+    bool Read(int fd, std::string& reason) {
+        struct stat before, after;
+        if (::fstat(fd, &before) != 0) {
+            reason = std::strerror(errno);
             return false;
         }
-        map_ = base;
-        mapLength_ = length;
-        size_ = size;
-        return true;
-    }
-
-    bool ReadAll(int fd, std::string& reason) {
-        std::string text;
-        char buf[1 << 16];
-        for (;;) {
-            ssize_t n = ::read(fd, buf, sizeof buf);
-            if (n == 0) break;
+        if (S_ISDIR(before.st_mode)) {
+            reason = std::strerror(EISDIR);
+            return false;
+        }
+        if (!S_ISREG(before.st_mode)) {
+            reason = "not a regular file; the design is read from a file whose size is known";
+            return false;
+        }
+        const size_t size = static_cast<size_t>(before.st_size);
+        copy_ = simdjson::padded_string(size);
+        if (size > 0 && copy_.data() == nullptr) throw std::bad_alloc();
+        size_t done = 0;
+        while (done < size) {
+            ssize_t n = ::pread(fd, copy_.data() + done, size - done, static_cast<off_t>(done));
+            if (n < 0 && errno == EINTR) continue;
             if (n < 0) {
-                if (errno == EINTR) continue;
                 reason = std::strerror(errno);
                 return false;
             }
-            text.append(buf, static_cast<size_t>(n));
+            if (n == 0) break;
+            done += static_cast<size_t>(n);
         }
-        Copy(text);
+        if (done != size || ::fstat(fd, &after) != 0 || after.st_size != before.st_size ||
+            after.st_mtim.tv_sec != before.st_mtim.tv_sec ||
+            after.st_mtim.tv_nsec != before.st_mtim.tv_nsec) {
+            reason = "the file changed while it was read";
+            return false;
+        }
         return true;
     }
 
-    void* map_ = nullptr;
-    size_t mapLength_ = 0;
-    size_t size_ = 0;
     simdjson::padded_string copy_;
 };
 
@@ -179,8 +157,14 @@ void Parse(Design& d, const Input& text) {
         d.parser.parse(reinterpret_cast<const uint8_t*>(text.data()), text.size(), false)
             .get(d.root);
     if (!err) return;
+    if (err == simdjson::MEMALLOC) throw std::bad_alloc();
     std::string what = simdjson::error_message(err);
     size_t at = FindSyntaxError(text.data(), text.size());
+    // A number the syntax allows that the parser still refuses does not fit
+    // in 64 bits.
+    if (at == std::string::npos &&
+        (err == simdjson::NUMBER_ERROR || err == simdjson::NUMBER_OUT_OF_RANGE))
+        Fail("number out of range: a number in the file does not fit in 64 bits");
     if (at != std::string::npos)
         Fail("malformed JSON at byte offset " + std::to_string(at) + " (" +
              Position(text.data(), text.size(), at) + "): " + what);
@@ -194,6 +178,7 @@ bool Run(Design& d, Input& text, Nlw_NlView& view, std::unique_ptr<Nlw_Design>& 
         text.Release();
         ReadModuleList(d);
         ResolveHierarchy(d);
+        CheckUnfoldedSize(d);
         d.ReleaseDocument();
         if (d.options.flatten)
             BuildFlat(d, view);
@@ -205,7 +190,10 @@ bool Run(Design& d, Input& text, Nlw_NlView& view, std::unique_ptr<Nlw_Design>& 
     } catch (const ReadError& e) {
         NLW_MSG().issueError("%s: %s\n", d.File(), e.text.c_str());
     } catch (const std::bad_alloc&) {
-        NLW_MSG().issueError("%s: not enough memory to load the design\n", d.File());
+        NLW_MSG().issueError(
+            "%s: out of memory: the design does not fit in the memory of this "
+            "machine\n",
+            d.File());
     }
     return false;
 }

@@ -99,6 +99,15 @@ bool Nlw_CellLibrary::Parse(const std::string& text, const char* origin, std::st
                 pin.bus = true;
                 if (!ParseIndex(tok[3], pin.msb) || !ParseIndex(tok[4], pin.lsb))
                     return fail("bad bus range '" + tok[3] + " " + tok[4] + "'");
+                // Every bit becomes a pin of every instance: a width beyond
+                // this is a fault of the file, not a cell.
+                const int64_t width =
+                    (pin.msb > pin.lsb ? int64_t(pin.msb) - pin.lsb : int64_t(pin.lsb) - pin.msb) +
+                    1;
+                if (width > kMaxBusWidth)
+                    return fail("bus '" + pin.name + "' is " + std::to_string(width) +
+                                " bits wide; at most " + std::to_string(kMaxBusWidth) +
+                                " bits are allowed");
             }
             if (tok.size() == fixed + 1) {
                 if (tok[fixed] != "pad") return fail("unexpected '" + tok[fixed] + "'");

@@ -1,6 +1,11 @@
 // Unfolding the hierarchy: every instance of a module becomes a macro block
 // with its own ports, signals and children, made depth-first in cell order.
 // The walk keeps its own stack, so nesting depth is bounded only by memory.
+#include <sys/resource.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <cstdio>
 #include <deque>
 #include <string>
 
@@ -154,6 +159,49 @@ private:
 };
 
 }  // namespace
+
+// Counted in floating point, so that a hierarchy that multiplies out to
+// 2^60 instances cannot overflow the count.
+void CheckUnfoldedSize(const Design& d) {
+    struct Size {
+        double blocks = 0, pins = 0, nets = 0;
+    };
+    std::vector<Size> size(d.modules.size());
+    for (uint32_t mi : d.bottomUp) {
+        const Module& m = d.modules[mi];
+        Size& s = size[mi];
+        s.nets = m.numNets;
+        for (const Cell& c : m.cells) {
+            s.blocks += 1;
+            if (c.macro) {
+                const Size& child = size[c.type];
+                s.blocks += child.blocks;
+                s.pins += d.modules[c.type].numPins + child.pins;
+                s.nets += child.nets;
+            } else {
+                for (uint32_t w : d.variants[c.type].width) s.pins += w;
+            }
+        }
+    }
+    const Size& top = size[d.top];
+    // The model's objects with a share of their lists and names.
+    const double bytes =
+        1.5 * (top.blocks * (sizeof(Nlw_NlBlock) + 32) + top.pins * sizeof(Nlw_NlPin) +
+               top.nets * (sizeof(Nlw_NlSignal) + 32));
+    double limit = double(::sysconf(_SC_PHYS_PAGES)) * double(::sysconf(_SC_PAGESIZE));
+    struct rlimit rl;
+    if (::getrlimit(RLIMIT_AS, &rl) == 0 && rl.rlim_cur != RLIM_INFINITY)
+        limit = std::min(limit, double(rl.rlim_cur));
+    if (limit <= 0) limit = 1e18;
+    if (bytes <= limit && top.blocks < 4e9) return;
+    const double gib = 1024.0 * 1024.0 * 1024.0;
+    char text[256];
+    std::snprintf(text, sizeof text,
+                  "the hierarchy unfolds to %.4g instances, which need about %.3g GiB of "
+                  "memory; this machine has %.3g GiB",
+                  top.blocks, bytes / gib, limit / gib);
+    Fail(text);
+}
 
 void BuildUnfolded(Design& d, Nlw_NlView& view) {
     Unfolder(d, view).Run();

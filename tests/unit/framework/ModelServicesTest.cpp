@@ -132,7 +132,7 @@ TEST(NetlistWriterModel, DumpListsTheNetlist) {
     nlw.SetParams(&params);
     nlw.SetView(&d.view);
     nlw.SetDesign(&design);
-    hosttest::WriteFile(dir / "top.nlw", "an older dump\n");
+    hosttest::WriteFile(dir / "top.nlw", "# Netlist dump of design old\n");
     QuietCapture capture;
     nlw.WriteNlwFile();
     nlwtest::ExpectGolden("netlist_writer/dump_lists_the_netlist",

@@ -9,6 +9,8 @@
 #include <string>
 
 #include "HostTestSupport.h"
+#include "framework/Nlw_FileRun.h"
+#include "framework/Nlw_FileSafety.h"
 #include "framework/Nlw_Writer.h"
 
 namespace {
@@ -270,6 +272,57 @@ TEST(Writer, CopyDiscardsItsOutput) {
     EXPECT_EQ(ReadFile(path), "  original\n");
     EXPECT_EQ(ReadFile(dir / "other.v"), "other text\n");
     EXPECT_TRUE(capture.msgs.empty());
+}
+
+// In a run, files go into place only when all of them are complete: a
+// failed file, or one that cannot be placed, leaves every old file and no
+// new one.
+TEST(WriterRun, PlacesAllFilesOrNone) {
+    enum Fault { kNone, kWriteFails, kTakenMeanwhile };
+    for (Fault fault : {kNone, kWriteFails, kTakenMeanwhile}) {
+        SCOPED_TRACE(fault);
+        TempDir dir;
+        WriteFile(dir / "top.pin", "old pin\n");
+        QuietCapture capture;
+        bool committed;
+        {
+            Nlw_FileRun run;
+            PlainWriter pin(nullptr, (dir / "top.pin").c_str(), Port::Stream::Replace);
+            pin.WriteL("new pin");
+            EXPECT_TRUE(pin.Close());
+            PlainWriter tv(nullptr, (dir / "top.tv").c_str(), Port::Stream::Create);
+            tv.WriteL("new tv");
+            EXPECT_TRUE(tv.Close());
+            PlainWriter net(nullptr, (dir / "top.v").c_str(), Port::Stream::Create);
+            net.WriteL("new netlist");
+            if (fault == kWriteFails) {
+                FileSizeLimit limit(4);
+                net.Close();
+            }
+            if (fault == kTakenMeanwhile) WriteFile(dir / "top.v", "someone else's\n");
+            net.Close();
+            EXPECT_EQ(ReadFile(dir / "top.pin"), "old pin\n");  // nothing placed yet
+            committed = run.Commit();
+        }
+        EXPECT_EQ(committed, fault == kNone);
+        EXPECT_EQ(ReadFile(dir / "top.pin"), fault == kNone ? "new pin\n" : "old pin\n");
+        const char* const kLeft[] = {"top.pin\ntop.tv\ntop.v\n", "top.pin\n", "top.pin\ntop.v\n"};
+        EXPECT_EQ(ListDir(dir.path()), kLeft[fault]);
+        if (fault == kTakenMeanwhile) {
+            EXPECT_EQ(ReadFile(dir / "top.v"), "someone else's\n");
+        }
+        EXPECT_EQ(capture.Count(Port_MsgLevel::Error), fault == kNone ? 0u : 1u);
+    }
+}
+
+TEST(FileSafety, ModuleFileNamesAreSafeAndUniqueIgnoringCase) {
+    const std::vector<std::string> names = {"top",   "../../escaped",      "a b/c", "esc$x ", "Top",
+                                            "top",   "chipwide",           "-opt",  "CON",    "",
+                                            "top_2", std::string(300, 'x')};
+    const std::vector<std::string> expected = {
+        "top",        "______escaped", "a_b_c", "esc_x_", "Top_2",   "top",
+        "chipwide_2", "_-opt",         "CON_",  "_",      "top_2_2", std::string(120, 'x')};
+    EXPECT_EQ(Nlw_FileSafety::SafeFileNames(names, {"CHIPWIDE", "net_ism"}), expected);
 }
 
 TEST(PropOutFilter, NamesAndPatternsIgnoringCaseFromAReadableFile) {

@@ -125,16 +125,22 @@ TEST_F(VerilogFlow, DumpsTheHostNetlistWhenAsked) {
     EXPECT_EQ(Files(), (std::vector<std::string>{"top.nlw", "top.v"}));
 }
 
-TEST_F(VerilogFlow, MultipleHierarchyWritesOneFilePerModuleType) {
+TEST_F(VerilogFlow, MultipleHierarchyWritesOneSafeFilePerModuleType) {
+    // Module names that lead out of the folder or name the run's own files
+    // still give a file each, inside the folder and apart from the others.
+    Nlw_NlBuilder builder(&view);
+    builder.CreateMacro(view.GetRootMacro(), builder.AddModuleType("../../esc"), "u3");
+    builder.CreateMacro(view.GetRootMacro(), builder.AddModuleType("chipwide"), "u4");
     params.SetMHFMode(true);
     for (bool models : {false, true}) {
         SCOPED_TRACE(models);
         params.SetWriteInstantiatedTimcells(models);
         Port_MsgCapture capture;
         nlw.WriteDesign();
-        // The descending walk meets u2 (SUB) before u1 (sub), which then writes
-        // nothing; the chipwide file is always written.
-        std::vector<std::string> files = {"SUB.v", "chipwide.v", "top.v"};
+        // sub and SUB are two modules, and on a file system that ignores
+        // case they must not share a file.
+        std::vector<std::string> files = {"SUB.v",        "______esc.v", "chipwide.v",
+                                          "chipwide_2.v", "sub_2.v",     "top.v"};
         if (models) files.push_back("top_ism.v");
         files.push_back("top_mhf_info.txt");
         EXPECT_EQ(Files(), files);

@@ -1,5 +1,6 @@
 // Files, line reading, installation roots and data file lookup.
 #include <gtest/gtest.h>
+#include <sys/stat.h>
 
 #include <string>
 #include <vector>
@@ -172,6 +173,29 @@ TEST(VornixPath, LooksUpInTheFirstRootHoldingThePath) {
     ASSERT_TRUE(stream.readline(line));
     EXPECT_EQ(line, "second");
     EXPECT_FALSE(Port::VornixPath::OpenFile("src/none.v", stream));
+}
+
+// Installation data is bounded: a device or fifo is refused at once, and a
+// line beyond the limit ends the reading, each with one error naming the file.
+TEST(PortFile, DataThatNeverEndsIsRefused) {
+    TempDir dir;
+    const std::string longLine = dir / "long.key";
+    WriteFile(longLine, "A = 1\n" + std::string(Port::File::kMaxLine + 10, 'x') + "\nB = 2\n");
+    ASSERT_EQ(::mkfifo((dir / "fifo").c_str(), 0600), 0);
+    hosttest::QuietCapture capture;
+    EXPECT_EQ(WholeLines(longLine).size(), 1u);  // the lines before it
+    Port::Stream stream(Port::Stream::Read, 4096);
+    std::string content, error;
+    for (const std::string& path : {std::string("/dev/zero"), dir / "fifo"}) {
+        EXPECT_FALSE(Port::File::open(path.c_str(), stream, 0));
+        EXPECT_FALSE(Port::File::readAll(path.c_str(), content, &error));
+        EXPECT_EQ(error, "not a regular file");
+    }
+    EXPECT_EQ(capture.Texts(Port_MsgLevel::Error),
+              (std::vector<std::string>{
+                  "Cannot read file '" + longLine + "': line 2 is longer than 1048576 bytes.\n",
+                  "Cannot read file '/dev/zero': not a regular file.\n",
+                  "Cannot read file '" + (dir / "fifo") + "': not a regular file.\n"}));
 }
 
 TEST(PortEnv, DataFileFromTheFirstRootHoldingIt) {

@@ -53,6 +53,8 @@ TEST(CellLibrary, RefusesMalformedLinesWithTheirNumber) {
         {"cell A timcell\nbus D input 7\n", ":2: expected 'bus NAME DIR MSB LSB'"},
         {"cell A timcell\nbus D input 7 x\n", ":2: bad bus range"},
         {"cell A timcell\nbus D input 99999999999 0\n", ":2: bad bus range"},
+        {"cell A timcell\nbus D input 16777216 0\n", ":2: bus 'D' is 16777217 bits wide"},
+        {"cell A timcell\nbus D input -2147483648 2147483647\n", ":2: bus 'D' is 4294967296 bits"},
         {"cell A timcell\npin X input\npin X output\n", ":3: pin 'X' of cell 'A' is given twice"},
         {"cell A timcell\ncell A timcell\n", ":2: cell 'A' is defined twice"},
         {"cell A timcell extra\n", ":1: unexpected 'extra'"},
