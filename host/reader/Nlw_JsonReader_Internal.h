@@ -396,7 +396,6 @@ inline void AddNameFlags(Nlw_NlSignal* s, uint8_t flags) {
     if (flags & kUserVisible) s->AddProperty(Vdm_Property::NewInt("USER_VISIBLE", 1));
 }
 
-
 // Refuses a design whose unfolded hierarchy would not fit in memory, before
 // any of it is built.
 void CheckUnfoldedSize(const Design& d);
