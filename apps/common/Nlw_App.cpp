@@ -180,7 +180,8 @@ int RunProgram(Nlw_Program program, int argc, const char* const* argv) {
     Nlw_Params& params = cl.params;
     std::string input = ResolveInput(params.GetInputFileName());
     params.SetInputFileName(input.c_str());
-    params.AddInputFile("block RAM data", cl.bramData.c_str());
+    for (const Nlw_CommandLine::BramData& bd : cl.bramData)
+        params.AddInputFile("block RAM data", bd.file.c_str());
     params.AddInputFile("constraints", cl.qcfFile.c_str());
     if (!Nlw_CheckRunFiles(params, cl.wrapLog.c_str())) return 2;
     if (params.GetLogFileName() && !messages.OpenLog(params.GetLogFileName())) {

@@ -176,6 +176,15 @@ Nlw_FileRun* Nlw_FileRun::Current() {
 
 void Nlw_FileRun::Add(const std::string& fileName, const std::string& temp,
                       const std::string& target, bool createOnly) {
+    // A file written again in the same run (the passes of the assertion
+    // file, timing files of blocks of one type): the later text wins, as it
+    // would have had each been placed at once.
+    for (Pending& p : files_)
+        if (p.target == target) {
+            Nlw_TempFile::Remove(p.temp);
+            p.temp = temp;
+            return;
+        }
     Pending p;
     p.fileName = fileName;
     p.temp = temp;

@@ -49,6 +49,9 @@ const char* const kOwnMarks[] = {
     "// Vornix signal/pin map file produced by program",
     "`define CHIPWIDE",
     "# Netlist dump of design ",
+    "(VENDOR \"nlw-verilog\")",
+    "# Hierarchy information of a multiple-hierarchy Verilog netlist.",
+    "Equivalence guidance for design ",
 };
 
 }  // namespace

@@ -291,8 +291,11 @@ TEST(WriterRun, PlacesAllFilesOrNone) {
             pin.WriteL("new pin");
             EXPECT_TRUE(pin.Close());
             PlainWriter tv(nullptr, (dir / "top.tv").c_str(), Port::Stream::Create);
-            tv.WriteL("new tv");
+            tv.WriteL("first tv");
             EXPECT_TRUE(tv.Close());
+            PlainWriter again(nullptr, (dir / "top.tv").c_str(), Port::Stream::Create);
+            again.WriteL("new tv");  // written twice in one run: the later wins
+            EXPECT_TRUE(again.Close());
             PlainWriter net(nullptr, (dir / "top.v").c_str(), Port::Stream::Create);
             net.WriteL("new netlist");
             if (fault == kWriteFails) {
@@ -308,6 +311,9 @@ TEST(WriterRun, PlacesAllFilesOrNone) {
         EXPECT_EQ(ReadFile(dir / "top.pin"), fault == kNone ? "new pin\n" : "old pin\n");
         const char* const kLeft[] = {"top.pin\ntop.tv\ntop.v\n", "top.pin\n", "top.pin\ntop.v\n"};
         EXPECT_EQ(ListDir(dir.path()), kLeft[fault]);
+        if (fault == kNone) {
+            EXPECT_EQ(ReadFile(dir / "top.tv"), "new tv\n");
+        }
         if (fault == kTakenMeanwhile) {
             EXPECT_EQ(ReadFile(dir / "top.v"), "someone else's\n");
         }
