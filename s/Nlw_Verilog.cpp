@@ -22,6 +22,7 @@
 #include "port/UT.h"
 #include "writers/Nlw_AssertionWriter.h"
 #include "writers/Nlw_MhfInfoWriter.h"
+#include "writers/Nlw_SdfWriter.h"
 
 namespace {
 
@@ -214,10 +215,9 @@ void Nlw_Verilog::WriteISMFile() {
 }
 
 // ---------------------------------------------------------------------------
-// Drivers of the other files. The timing, assertion and hierarchy
-// information files are written by host writers this host does not have
-// yet: their drivers form the file names only, and announce and write
-// nothing.
+// Drivers of the other files. The assertion and hierarchy information
+// files are written by host writers this host does not have yet: their
+// drivers form the file names only, and announce and write nothing.
 
 std::string Nlw_Verilog::GetSdfFileName() const {
     const char* sdfPath = GetParams()->GetSdfPath();
@@ -281,19 +281,32 @@ std::string Nlw_Verilog::GetAssertionFileName() const {
 
 void Nlw_Verilog::WriteSdfFile() {
     const std::string fileName = GetSdfFileName();
-    // The timing file writer comes later.
-    (void)fileName;
+    if (Nlw_SdfWriter::IsTimingSource(this, fileName.c_str())) return;
+    NLW_MSG().issueStatus("Writing Verilog SDF file '%s' ...\n", fileName.c_str());
+    Nlw_SdfWriter writer(this, fileName.c_str(), GetParams()->GetOutputFileMode());
+    writer.WriteView(GetView(), 0);
 }
 
-// One timing file per module block, not grouped by type.
+// One timing file per module block. The file is named after the block's
+// type, as the $sdf_annotate statement of the type's module names it: the
+// first block of a type met in the descending walk writes it, as for the
+// netlist files (a second block of the type would write the same file).
 void Nlw_Verilog::WriteSdfMHFile() {
+    NLW_MSG().issueStatus("Writing multiple Verilog SDF files for design '%s' ...\n",
+                          GetDesignName());
+    const Port::Stream::Access mode = GetParams()->GetOutputFileMode();
+    UT_NCH_CACHE written(false);
     const UT_DARRAY<Nlw_NlBlock*>& macros = GetView()->GetMacros();
     for (size_t i = macros.GetCount(); i-- > 0;) {
         Nlw_NlBlock* block = macros[i];
         if (block == nullptr || !block->IsMacro()) continue;
         const std::string fileName = GetSdfMHFileName(block);
-        // The timing file writer comes later.
-        (void)fileName;
+        UT_NCH_NAME* entry = written.add(fileName.c_str(), 1);
+        if (entry == nullptr || entry->GetCount() != 1) continue;
+        if (Nlw_SdfWriter::IsTimingSource(this, fileName.c_str())) continue;
+        Port_MsgManData::debugStub("Writing Verilog SDF file '%s' ...\n", fileName.c_str());
+        Nlw_SdfWriter writer(this, fileName.c_str(), mode);
+        writer.WriteMHBlock(block);
     }
 }
 

@@ -173,7 +173,15 @@ void Nlw_VerilogWriter::WriteSdfAnnotate(Nlw_NlBlock* block) {
 
     std::string name = UT_STR::OrEmpty(params->GetSdfPath());
     if (!name.empty()) name += '/';
-    name += UT_STR::OrEmpty(block->GetFileBaseName());
+    if (params->GetMHFMode()) {
+        name += UT_STR::OrEmpty(block->GetFileBaseName());
+    } else {
+        // A netlist of one file has one timing file, which its driver names
+        // after the netlist file, not after the module.
+        const std::string output =
+            UT_PATH::InternalPath(UT_STR::OrEmpty(params->GetOutputFileName()));
+        name += UT_PATH::GetBase(output.c_str());
+    }
     name += ".sdf";
     name = UT_PATH::InternalPath(name.c_str());
 

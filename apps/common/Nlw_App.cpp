@@ -13,6 +13,7 @@
 #include "Nlw_MessageStyle.h"
 #include "Nlw_RunFiles.h"
 #include "Nlw_Verilog.h"
+#include "framework/Nlw_Timing.h"
 #include "framework/Nlw_Util.h"
 #include "model/Nlw_NlBuilder.h"
 #include "port/Port.h"
@@ -163,10 +164,12 @@ int RunProgram(Nlw_Program program, int argc, const char* const* argv) {
         if (program == Nlw_Program::Tessel && known) {
             for (const std::string& line : Nlw_TesselOptionHelp(cl.helpTopic))
                 Port_MsgManData::createObject("NetListWriters").issueStatus("%s", line.c_str());
+            Nlw_PrintTimingHelp();
             return 0;
         }
         Nlw_Verilog help = program == Nlw_Program::Qdb2ver ? Nlw_Verilog() : Nlw_Verilog("tessel");
         help.GetHelp()();
+        Nlw_PrintTimingHelp();
         return 0;
     }
     if (!cl.error.empty()) return UsageError(program, cl.error);
@@ -242,6 +245,9 @@ int RunProgram(Nlw_Program program, int argc, const char* const* argv) {
     clock.Trace("Preparing the properties");
     if (!cl.bramData.empty() && !Nlw_LoadBlockRamData(writer, cl.bramData)) return 2;
     if (!cl.qcfFile.empty() && !Nlw_CheckQcfFile(view, cl.qcfFile.c_str())) return 2;
+    std::unique_ptr<Nlw_Timing> timing;
+    if (!Nlw_AttachTiming(cl.timing, params, view, writer, timing)) return 2;
+    clock.Trace("Reading the timing");
     writer.WriteDesign();
     if (!cl.bramDir.empty()) Nlw_WriteBlockRamFiles(writer, cl.bramDir.c_str());
     clock.Trace("Writing");

@@ -92,6 +92,17 @@ std::vector<Option> CommonOptions() {
          IGNORE("--ub",
                 "buses are always written as buses here; the option is accepted so that older "
                 "command lines keep working.")},
+        // The host's timing options.
+        {"-timing", Arg::Value,
+         [](Nlw_CommandLine& cl, const std::string& v) {
+             cl.timing.source = v;
+             return std::string();
+         }},
+        {"-timing_nets", Arg::Value,
+         [](Nlw_CommandLine& cl, const std::string& v) {
+             cl.timing.nets = v;
+             return Nlw_CheckTimingNets(v);
+         }},
     };
 }
 

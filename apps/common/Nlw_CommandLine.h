@@ -4,6 +4,7 @@
 #include <string>
 #include <vector>
 
+#include "Nlw_AppTiming.h"
 #include "framework/Nlw_Params.h"
 
 enum class Nlw_Program { Qdb2ver, Tessel };
@@ -11,11 +12,12 @@ enum class Nlw_Program { Qdb2ver, Tessel };
 // What the command line asked for besides the run parameters.
 struct Nlw_CommandLine {
     Nlw_Params params;
-    bool help = false;      // -h: print the help text
-    std::string helpTopic;  // tessel -h <netlist_type>
-    bool version = false;   // --version: print the program's version
-    bool debug = false;     // --debug or -verbose: debug traces on the console
-    bool quiet = false;     // -quiet, -intstyle silent
+    bool help = false;         // -h: print the help text
+    std::string helpTopic;     // tessel -h <netlist_type>
+    bool version = false;      // --version: print the program's version
+    bool debug = false;        // --debug or -verbose: debug traces on the console
+    bool quiet = false;        // -quiet, -intstyle silent
+    Nlw_TimingOptions timing;  // -timing, -timing_nets
     // Options accepted but without effect here, in the order given; each
     // gets its one warning (the text, which names the option and says why).
     std::vector<std::string> ignored;

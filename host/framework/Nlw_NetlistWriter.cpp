@@ -36,6 +36,7 @@ Nlw_NetlistWriter::Nlw_NetlistWriter(const Nlw_NetlistWriter& other)
       view_(other.view_),
       design_(other.design_),
       typeLib_(other.typeLib_),
+      timing_(other.timing_),
       pic_(other.pic_),
       devkey_(other.devkey_),
       isVornixCore_(other.isVornixCore_),
@@ -52,6 +53,7 @@ Nlw_NetlistWriter& Nlw_NetlistWriter::operator=(const Nlw_NetlistWriter& other) 
     view_ = other.view_;
     design_ = other.design_;
     typeLib_ = other.typeLib_;
+    timing_ = other.timing_;
     pic_ = other.pic_;
     devkey_ = other.devkey_;
     isVornixCore_ = other.isVornixCore_;

@@ -16,6 +16,7 @@
 
 class Nlw_Writer;
 class Nlw_NlNetwork;
+class Nlw_Timing;
 class Ldm_TypeLib;
 
 // One parameter definition of the simulation library: name, expected type
@@ -99,6 +100,10 @@ public:
     void SetDesign(Nlw_Design* d) { design_ = d; }
     Ldm_TypeLib* GetTypeLib() const { return typeLib_; }
     void SetTypeLib(Ldm_TypeLib* t) { typeLib_ = t; }
+    // The delays of a timing-annotated design (null when there are none);
+    // owned by the host program.
+    Nlw_Timing* GetTiming() const { return timing_; }
+    void SetTiming(Nlw_Timing* t) { timing_ = t; }
     // The device data of the run's part ("device.key" of the installation),
     // made on first use.
     PM_DEVKEY* GetDevkey();
@@ -143,6 +148,7 @@ private:
     Nlw_NlView* view_ = nullptr;
     Nlw_Design* design_ = nullptr;
     Ldm_TypeLib* typeLib_ = nullptr;
+    Nlw_Timing* timing_ = nullptr;
     std::shared_ptr<PM_PIC> pic_;
     std::shared_ptr<PM_DEVKEY> devkey_;
     bool isVornixCore_ = false;

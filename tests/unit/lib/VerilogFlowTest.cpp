@@ -181,7 +181,8 @@ TEST_F(VerilogFlow, RequestedFilesAreWrittenBesideTheNetlist) {
     params.SetStaMode(true);
     params.SetSimMode(false);
     nlw.WriteDesign();
-    EXPECT_EQ(Files(), (std::vector<std::string>{"top.pcs", "top.pin", "top.tv", "top.v"}));
+    EXPECT_EQ(Files(),
+              (std::vector<std::string>{"top.pcs", "top.pin", "top.sdf", "top.tv", "top.v"}));
 }
 
 // The guidance file of each tool: one line per record of each FLOW part,
