@@ -4,6 +4,7 @@
 #include <cstring>
 #include <set>
 #include <string>
+#include <unordered_map>
 #include <vector>
 
 #include "model/Nlw_Nl.h"
@@ -76,14 +77,52 @@ private:
         timing_.entries.push_back(e);
     }
 
+    // A cell type's entries, worked out on its first cell by pin position
+    // and replayed on the others: the cells of one model type share their
+    // pin layout.
+    struct Item {
+        Nlw_TimingKind kind;
+        uint8_t edge1, edge2;
+        uint32_t pin1, pin2;
+        std::vector<double> values;
+    };
+    struct TypeItems {
+        bool known = false;
+        std::vector<Item> items;
+    };
+
     void AddCell(Nlw_NlBlock* cell) {
-        const std::vector<Nlw_LibertyArc>* arcs = library_.FindCell(cell->GetTypeName());
-        if (arcs == nullptr) {
+        auto found = byType_.find(cell->GetType());
+        if (found == byType_.end()) found = byType_.emplace(cell->GetType(), Work(cell)).first;
+        const TypeItems& type = found->second;
+        if (!type.known) {
             unknown_.insert(cell->GetTypeName());
             return;
         }
-        if (arcs->empty()) return;
+        if (type.items.empty()) return;
         ++cells_;
+        for (const Item& item : type.items) {
+            Nlw_TimingEntry e;
+            e.kind = item.kind;
+            e.pin1 = cell->GetPin(item.pin1);
+            e.pin2 = cell->GetPin(item.pin2);
+            e.edge1 = item.edge1;
+            e.edge2 = item.edge2;
+            e.firstValue = static_cast<uint32_t>(timing_.values.size());
+            for (double v : item.values) timing_.values.push_back(Value(v));
+            e.numValues = static_cast<uint8_t>(item.values.size());
+            timing_.entries.push_back(e);
+        }
+    }
+
+    TypeItems Work(Nlw_NlBlock* cell) {
+        TypeItems type;
+        const std::vector<Nlw_LibertyArc>* arcs = library_.FindCell(cell->GetTypeName());
+        if (arcs == nullptr) return type;
+        type.known = true;
+        auto index = [cell](const Nlw_NlPin* pin) {
+            return static_cast<uint32_t>(pin - cell->GetPin(0));
+        };
         // Paths first, then checks, as a cell's entries are kept.
         for (Nlw_NlPin& pin : cell->GetPins()) {
             const std::string base = BaseName(pin.GetWritableName());
@@ -93,7 +132,12 @@ private:
                 if (from == nullptr) continue;
                 const double rise = arc.hasRise ? arc.rise : arc.fall;
                 const double fall = arc.hasFall ? arc.fall : arc.rise;
-                Push(Nlw_TimingKind::IoPath, from, arc.edge, &pin, NLW_EDGE_NONE, {rise, fall});
+                type.items.push_back({Nlw_TimingKind::IoPath,
+                                      arc.edge,
+                                      NLW_EDGE_NONE,
+                                      index(from),
+                                      index(&pin),
+                                      {rise, fall}});
             }
         }
         for (Nlw_NlPin& pin : cell->GetPins()) {
@@ -116,15 +160,21 @@ private:
                         other = &o;
                 const double limit = std::max(arc.rise, arc.fall);
                 if (other) {
-                    Push(arc.kind == Nlw_TimingKind::Setup ? Nlw_TimingKind::SetupHold
-                                                           : Nlw_TimingKind::RecRem,
-                         &pin, NLW_EDGE_NONE, ref, arc.edge,
-                         {limit, std::max(other->rise, other->fall)});
+                    type.items.push_back({arc.kind == Nlw_TimingKind::Setup
+                                              ? Nlw_TimingKind::SetupHold
+                                              : Nlw_TimingKind::RecRem,
+                                          NLW_EDGE_NONE,
+                                          arc.edge,
+                                          index(&pin),
+                                          index(ref),
+                                          {limit, std::max(other->rise, other->fall)}});
                 } else {
-                    Push(arc.kind, &pin, NLW_EDGE_NONE, ref, arc.edge, {limit});
+                    type.items.push_back(
+                        {arc.kind, NLW_EDGE_NONE, arc.edge, index(&pin), index(ref), {limit}});
                 }
             }
         }
+        return type;
     }
 
     // Walks a net from its driver through module ports to its loads.
@@ -170,6 +220,7 @@ private:
     const Nlw_Liberty& library_;
     Nlw_Timing& timing_;
     std::set<std::string> unknown_;
+    std::unordered_map<const Nlw_NlType*, TypeItems> byType_;
     size_t cells_ = 0;
 };
 

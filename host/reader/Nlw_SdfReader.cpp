@@ -1,6 +1,7 @@
 #include "reader/Nlw_SdfReader.h"
 
 #include <cerrno>
+#include <charconv>
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
@@ -262,6 +263,15 @@ private:
     // The block an instance path names, relative to a block (the whole
     // path when base is null); null when there is none.
     Nlw_NlBlock* FindBlock(const Nlw_NlBlock* base, const std::string& path) {
+        // Consecutive entries often name one instance (the driver of a
+        // net with several loads): the last answer is kept.
+        if (base == lastBase_ && path == lastPath_ && lastFound_) return lastFound_;
+        lastBase_ = base;
+        lastPath_ = path;
+        lastFound_ = Lookup(base, path);
+        return lastFound_;
+    }
+    Nlw_NlBlock* Lookup(const Nlw_NlBlock* base, const std::string& path) {
         if (index_.empty()) MakeIndex();
         std::string key = base ? pathOf_[base] : std::string();
         if (!path.empty()) {
@@ -577,10 +587,11 @@ private:
                 text.substr(start, colon == std::string::npos ? colon : colon - start);
             if (field > 2) Fail("'" + text + "' has more than three values");
             if (!part.empty()) {
-                char* rest = nullptr;
-                errno = 0;
-                const double v = std::strtod(part.c_str(), &rest);
-                if (rest == part.c_str() || *rest != '\0' || errno == ERANGE)
+                double v = 0;
+                const char* end = part.data() + part.size();
+                const char* begin = part.data() + (part[0] == '+' ? 1 : 0);
+                const std::from_chars_result got = std::from_chars(begin, end, v);
+                if (got.ec != std::errc() || got.ptr != end || begin == end)
                     Fail("delay value '" + part + "' is not a number");
                 r.v[field] = v * scale_;
                 r.present |= static_cast<uint8_t>(1 << field);
@@ -627,6 +638,9 @@ private:
     bool sawVersion_ = false;
     size_t unmatched_ = 0;
     std::unordered_map<std::string, Nlw_NlBlock*> index_;
+    const Nlw_NlBlock* lastBase_ = nullptr;
+    std::string lastPath_;
+    Nlw_NlBlock* lastFound_ = nullptr;
     std::unordered_map<const Nlw_NlBlock*, std::string> pathOf_;
 };
 
@@ -655,6 +669,11 @@ bool Nlw_SdfReader::Load(const char* fileName, Nlw_NlView& view, Nlw_Timing& tim
         return false;
     }
     std::string text;
+    if (std::fseek(fp, 0, SEEK_END) == 0) {
+        const long size = std::ftell(fp);
+        if (size > 0) text.reserve(static_cast<size_t>(size));
+        std::rewind(fp);
+    }
     char buf[1 << 16];
     size_t n;
     while ((n = std::fread(buf, 1, sizeof buf, fp)) > 0) text.append(buf, n);

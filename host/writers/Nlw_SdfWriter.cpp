@@ -3,6 +3,7 @@
 #include <sys/stat.h>
 
 #include <algorithm>
+#include <charconv>
 #include <cmath>
 #include <cstdio>
 #include <cstring>
@@ -19,14 +20,6 @@ bool IsPlain(char c) {
 
 const char* EdgeWord(uint8_t edge) {
     return edge == NLW_EDGE_POS ? "posedge" : edge == NLW_EDGE_NEG ? "negedge" : nullptr;
-}
-
-// A value as a whole number of written units; SDF readers round to their
-// own precision, so writing the netlist's precision keeps both in step.
-void AppendNumber(std::string& text, double ps, double unit) {
-    char buf[32];
-    std::snprintf(buf, sizeof buf, "%lld", static_cast<long long>(std::llround(ps / unit)));
-    text += buf;
 }
 
 }  // namespace
@@ -106,8 +99,27 @@ void Nlw_SdfWriter::WriteHead(Nlw_NlBlock* scope) {
     DownIndent();
 }
 
+// The body is formatted into a block of text handed to the file writer in
+// large pieces: a timing file has several lines per cell, and a line at a
+// time costs more than the formatting.
+void Nlw_SdfWriter::Line(int depth) {
+    text_.append(static_cast<size_t>(depth) * kIndentWidth, ' ');
+    text_ += line_;
+    text_ += '\n';
+}
+
+void Nlw_SdfWriter::Line(int depth, const char* text) {
+    line_ = text;
+    Line(depth);
+}
+
+void Nlw_SdfWriter::FlushText(bool always) {
+    if (text_.empty() || (!always && text_.size() < kFlushSize)) return;
+    Write(text_.c_str(), 0, 0);
+    text_.clear();
+}
+
 void Nlw_SdfWriter::WriteEntries(Nlw_NlBlock* scope, const std::vector<uint32_t>& list) {
-    UpIndent();
     std::vector<uint32_t> nets;
     for (uint32_t i : list)
         if (timing_->entries[i].kind == Nlw_TimingKind::Interconnect) nets.push_back(i);
@@ -125,47 +137,54 @@ void Nlw_SdfWriter::WriteEntries(Nlw_NlBlock* scope, const std::vector<uint32_t>
         WriteCell(scope, cell, cells.data() + b, cells.data() + e);
         b = e;
     }
-    DownIndent();
+    FlushText(true);
 }
 
 // The nets of a scope: one CELL of the scope's own type with an empty
 // INSTANCE, holding INTERCONNECT or PORT entries.
 void Nlw_SdfWriter::WriteNets(Nlw_NlBlock* scope, const std::vector<uint32_t>& nets) {
-    WriteIL("(CELL");
-    UpIndent();
-    WriteIL(vorform("(CELLTYPE \"%s\")", scope->GetTypeName()));
-    WriteIL("(INSTANCE)");
-    WriteIL("(DELAY");
-    UpIndent();
-    WriteIL("(ABSOLUTE");
-    UpIndent();
+    Line(1, "(CELL");
+    line_ = "(CELLTYPE \"";
+    line_ += scope->GetTypeName();
+    line_ += "\")";
+    Line(2);
+    Line(2, "(INSTANCE)");
+    Line(2, "(DELAY");
+    Line(3, "(ABSOLUTE");
     const bool asPorts = timing_->netMode == Nlw_Timing::NetMode::Port;
-    std::string line;
     for (uint32_t i : nets) {
         const Nlw_TimingEntry& e = timing_->entries[i];
+        line_.clear();
         if (asPorts) {
-            line = "(PORT " + PinPath(e.pin2, scope);
+            line_ += "(PORT ";
+            AppendPinPath(e.pin2, scope);
         } else {
-            line = "(INTERCONNECT " + PinPath(e.pin1, scope) + ' ' + PinPath(e.pin2, scope);
+            line_ += "(INTERCONNECT ";
+            AppendPinPath(e.pin1, scope);
+            line_ += ' ';
+            AppendPinPath(e.pin2, scope);
         }
-        AppendValues(line, e);
-        line += ')';
-        WriteIL(line.c_str());
+        AppendValues(e);
+        line_ += ')';
+        Line(4);
+        FlushText(false);
     }
-    DownIndent();
-    WriteIL(")");
-    DownIndent();
-    WriteIL(")");
-    DownIndent();
-    WriteIL(")");
+    Line(3, ")");
+    Line(2, ")");
+    Line(1, ")");
 }
 
 void Nlw_SdfWriter::WriteCell(Nlw_NlBlock* scope, Nlw_NlBlock* cell, const uint32_t* first,
                               const uint32_t* last) {
-    WriteIL("(CELL");
-    UpIndent();
-    WriteIL(vorform("(CELLTYPE \"%s\")", cell->GetTypeName()));
-    WriteIL(("(INSTANCE " + InstancePath(cell, scope) + ")").c_str());
+    Line(1, "(CELL");
+    line_ = "(CELLTYPE \"";
+    line_ += cell->GetTypeName();
+    line_ += "\")";
+    Line(2);
+    line_ = "(INSTANCE ";
+    AppendInstancePath(cell, scope);
+    line_ += ')';
+    Line(2);
     // Delays first, then checks, each in their own section.
     for (int pass = 0; pass < 2; ++pass) {
         const bool checks = pass == 1;
@@ -175,55 +194,47 @@ void Nlw_SdfWriter::WriteCell(Nlw_NlBlock* scope, Nlw_NlBlock* cell, const uint3
             if (Nlw_Timing::IsCheck(e.kind) != checks) continue;
             if (!open) {
                 open = true;
-                WriteIL(checks ? "(TIMINGCHECK" : "(DELAY");
-                UpIndent();
-                if (!checks) {
-                    WriteIL("(ABSOLUTE");
-                    UpIndent();
-                }
+                Line(2, checks ? "(TIMINGCHECK" : "(DELAY");
+                if (!checks) Line(3, "(ABSOLUTE");
             }
-            WriteIL(EntryText(e, cell).c_str());
+            AppendEntry(e, cell);
+            Line(checks ? 3 : 4);
         }
         if (open) {
-            if (!checks) {
-                DownIndent();
-                WriteIL(")");
-            }
-            DownIndent();
-            WriteIL(")");
+            if (!checks) Line(3, ")");
+            Line(2, ")");
         }
     }
-    DownIndent();
-    WriteIL(")");
+    Line(1, ")");
+    FlushText(false);
 }
 
-std::string Nlw_SdfWriter::EntryText(const Nlw_TimingEntry& e, Nlw_NlBlock* cell) {
-    std::string text = "(";
-    text += Nlw_Timing::Keyword(e.kind);
-    text += ' ';
+void Nlw_SdfWriter::AppendEntry(const Nlw_TimingEntry& e, Nlw_NlBlock* cell) {
+    line_ = "(";
+    line_ += Nlw_Timing::Keyword(e.kind);
+    line_ += ' ';
     switch (e.kind) {
         case Nlw_TimingKind::IoPath:
-            text += PortTchk(e.pin1, e.edge1, cell);
-            text += ' ';
-            text += PinPath(e.pin2, cell);
+            AppendPortTchk(e.pin1, e.edge1, cell);
+            line_ += ' ';
+            AppendPinPath(e.pin2, cell);
             break;
         case Nlw_TimingKind::Port:
-            text += PinPath(e.pin1, cell);
+            AppendPinPath(e.pin1, cell);
             break;
         default:
-            text += PortTchk(e.pin1, e.edge1, cell);
+            AppendPortTchk(e.pin1, e.edge1, cell);
             if (e.pin2) {
-                text += ' ';
-                text += PortTchk(e.pin2, e.edge2, cell);
+                line_ += ' ';
+                AppendPortTchk(e.pin2, e.edge2, cell);
             }
             break;
     }
-    AppendValues(text, e);
-    text += ')';
-    return text;
+    AppendValues(e);
+    line_ += ')';
 }
 
-void Nlw_SdfWriter::AppendValues(std::string& text, const Nlw_TimingEntry& e) {
+void Nlw_SdfWriter::AppendValues(const Nlw_TimingEntry& e) {
     const Nlw_Rvalue* net = nullptr;
     uint8_t netCount = 0;
     if (e.kind == Nlw_TimingKind::IoPath && !netDelayOf_.empty()) {
@@ -236,10 +247,10 @@ void Nlw_SdfWriter::AppendValues(std::string& text, const Nlw_TimingEntry& e) {
     }
     for (uint8_t k = 0; k < e.numValues; ++k) {
         const Nlw_Rvalue& r = timing_->values[e.firstValue + k];
-        text += " (";
+        line_ += " (";
         if (r.present) {
             for (int f = 0; f < 3; ++f) {
-                if (f) text += ':';
+                if (f) line_ += ':';
                 if (!(r.present & (1 << f))) continue;
                 double v = r.v[f];
                 if (net) {
@@ -254,45 +265,104 @@ void Nlw_SdfWriter::AppendValues(std::string& text, const Nlw_TimingEntry& e) {
                     }
                     v += add;
                 }
-                AppendNumber(text, v, unit_);
+                AppendNumber(v);
             }
         }
-        text += ')';
+        line_ += ')';
     }
 }
 
-std::string Nlw_SdfWriter::InstancePath(const Nlw_NlBlock* block, const Nlw_NlBlock* scope) {
-    std::vector<const Nlw_NlBlock*> chain;
-    for (const Nlw_NlBlock* b = block; b && b != scope; b = b->GetParent()) chain.push_back(b);
-    std::string path;
-    for (size_t i = chain.size(); i-- > 0;) {
-        if (!path.empty()) path += '/';
-        path += EscapeName(chain[i]->GetWritableName());
-    }
-    return path;
+// A value as a whole number of written units; SDF readers round to their
+// own precision, so writing the netlist's precision keeps both in step.
+void Nlw_SdfWriter::AppendNumber(double ps) {
+    char buf[24];
+    const long long units = std::llround(ps / unit_);
+    char* end = std::to_chars(buf, buf + sizeof buf, units).ptr;
+    line_.append(buf, end);
 }
 
-std::string Nlw_SdfWriter::PinName(const Nlw_NlPin* pin) {
+void Nlw_SdfWriter::AppendEscaped(const char* name) {
+    const char* run = name;
+    for (const char* p = name; *p; ++p) {
+        if (IsPlain(*p)) continue;
+        line_.append(run, p);
+        line_ += '\\';
+        run = p;
+    }
+    line_ += run;
+}
+
+void Nlw_SdfWriter::AppendInstancePath(const Nlw_NlBlock* block, const Nlw_NlBlock* scope) {
+    // Cells come block by block, so the path of the parent is the one of
+    // the entry before, most of the time.
+    const Nlw_NlBlock* parent = block->GetParent();
+    if (block == scope) return;
+    if (parent != scope && parent != nullptr) {
+        if (parent != pathOwner_ || scope != pathScope_) {
+            pathOwner_ = parent;
+            pathScope_ = scope;
+            std::string saved;
+            saved.swap(line_);
+            const Nlw_NlBlock* chain[64];
+            size_t n = 0;
+            std::vector<const Nlw_NlBlock*> deep;
+            for (const Nlw_NlBlock* b = parent; b && b != scope; b = b->GetParent()) {
+                if (n < 64)
+                    chain[n++] = b;
+                else
+                    deep.push_back(b);
+            }
+            for (size_t i = deep.size(); i-- > 0;) {
+                AppendEscaped(deep[i]->GetWritableName());
+                line_ += '/';
+            }
+            for (size_t i = n; i-- > 0;) {
+                AppendEscaped(chain[i]->GetWritableName());
+                line_ += '/';
+            }
+            pathText_.swap(line_);
+            line_.swap(saved);
+        }
+        line_ += pathText_;
+    }
+    AppendEscaped(block->GetWritableName());
+}
+
+void Nlw_SdfWriter::AppendPinName(const Nlw_NlPin* pin) {
     const char* name = pin->GetWritableName();
     if (pin->IsBused()) {
         // A bus member "D[3]": the base is an identifier, the index stays.
         const char* bracket = std::strrchr(name, '[');
         if (bracket && bracket != name) {
-            std::string base(name, bracket);
-            return EscapeName(base.c_str()) + bracket;
+            for (const char* p = name; p != bracket; ++p) {
+                if (!IsPlain(*p)) line_ += '\\';
+                line_ += *p;
+            }
+            line_ += bracket;
+            return;
         }
     }
-    return EscapeName(name);
+    AppendEscaped(name);
 }
 
-std::string Nlw_SdfWriter::PinPath(const Nlw_NlPin* pin, const Nlw_NlBlock* scope) {
+void Nlw_SdfWriter::AppendPinPath(const Nlw_NlPin* pin, const Nlw_NlBlock* scope) {
     const Nlw_NlBlock* block = pin->GetBlock();
-    if (block == scope) return PinName(pin);
-    return InstancePath(block, scope) + '/' + PinName(pin);
+    if (block != scope) {
+        AppendInstancePath(block, scope);
+        line_ += '/';
+    }
+    AppendPinName(pin);
 }
 
-std::string Nlw_SdfWriter::PortTchk(const Nlw_NlPin* pin, uint8_t edge, const Nlw_NlBlock* scope) {
+void Nlw_SdfWriter::AppendPortTchk(const Nlw_NlPin* pin, uint8_t edge, const Nlw_NlBlock* scope) {
     const char* word = EdgeWord(edge);
-    std::string port = PinPath(pin, scope);
-    return word ? std::string("(") + word + ' ' + port + ')' : port;
+    if (word == nullptr) {
+        AppendPinPath(pin, scope);
+        return;
+    }
+    line_ += '(';
+    line_ += word;
+    line_ += ' ';
+    AppendPinPath(pin, scope);
+    line_ += ')';
 }

@@ -34,22 +34,36 @@ private:
     // Writes the entries listed (indexes into the timing data), paths
     // relative to scope.
     void WriteEntries(Nlw_NlBlock* scope, const std::vector<uint32_t>& list);
+    // Appends line_ (or text) as a line of the given depth to the text
+    // block; FlushText hands the block to the file when it is large (or
+    // always).
+    void Line(int depth);
+    void Line(int depth, const char* text);
+    void FlushText(bool always);
     void WriteNets(Nlw_NlBlock* scope, const std::vector<uint32_t>& nets);
     void WriteCell(Nlw_NlBlock* scope, Nlw_NlBlock* cell, const uint32_t* first,
                    const uint32_t* last);
-    std::string EntryText(const Nlw_TimingEntry& e, Nlw_NlBlock* relativeTo);
-    // "a/b/c" of the written instance names from below scope down to block;
-    // "" for scope itself.
-    std::string InstancePath(const Nlw_NlBlock* block, const Nlw_NlBlock* scope);
-    std::string PinPath(const Nlw_NlPin* pin, const Nlw_NlBlock* scope);
-    std::string PinName(const Nlw_NlPin* pin);
-    std::string PortTchk(const Nlw_NlPin* pin, uint8_t edge, const Nlw_NlBlock* scope);
-    // Appends " (v:v:v)" for each rvalue, with the net delay added when the
-    // design asks for net delays folded into paths.
-    void AppendValues(std::string& text, const Nlw_TimingEntry& e);
+    // The pieces of a line, appended to line_; paths relative to scope.
+    void AppendEntry(const Nlw_TimingEntry& e, Nlw_NlBlock* cell);
+    // " (v:v:v)" for each rvalue, with the net delay added when the design
+    // asks for net delays folded into paths.
+    void AppendValues(const Nlw_TimingEntry& e);
+    void AppendNumber(double ps);
+    void AppendEscaped(const char* name);
+    // "a/b/c" of the written instance names from below scope down to block.
+    void AppendInstancePath(const Nlw_NlBlock* block, const Nlw_NlBlock* scope);
+    void AppendPinName(const Nlw_NlPin* pin);
+    void AppendPinPath(const Nlw_NlPin* pin, const Nlw_NlBlock* scope);
+    void AppendPortTchk(const Nlw_NlPin* pin, uint8_t edge, const Nlw_NlBlock* scope);
     void MakeNetDelayIndex();
 
     Nlw_Timing* timing_ = nullptr;
+    std::string line_;
+    std::string text_;
+    // The escaped path, with its final "/", of the last parent block met.
+    const Nlw_NlBlock* pathOwner_ = nullptr;
+    const Nlw_NlBlock* pathScope_ = nullptr;
+    std::string pathText_;
     double unit_ = 1.0;  // picoseconds per written unit
     // For folding net delays into paths: the interconnect entry that drives
     // each input pin.

@@ -115,8 +115,10 @@ least_clock_path() {
 # ---------------------------------------------------------------------------
 # 1. Icarus Verilog.
 mkdir -p one iopath mhf
-"$tessel" -w -tm timed -timing routed.sdf routed.json one/timed.v > one/tessel.log 2>&1 ||
+if ! "$tessel" -w -tm timed -timing routed.sdf routed.json one/timed.v > one/tessel.log 2>&1; then
     fail "tessel -timing"
+    show one/tessel.log
+fi
 [ -s one/timed.sdf ] || fail "no timing file one/timed.sdf"
 grep -q 'initial $sdf_annotate("timed.sdf");' one/timed.v || fail "one/timed.v reads no timing file"
 if grep -q 'WARNING' one/tessel.log; then
