@@ -5,7 +5,9 @@
 # time per thousand cells (so that growth from 100k to 1M can be read off)
 # and the stage times of the debug channel (read / prepare / write).
 # Then the side-file writers (-tf, -pf, the translation file of -sta) on the
-# largest yosys-layout design. With --yosys it also times yosys read_json + write_verilog on the 100k
+# largest yosys-layout design, and the timing file (-timing, with the SDF of
+# bench/gen_sdf.py) on the largest compact design; its stage column has the
+# timing reader's time between prepare and write. With --yosys it also times yosys read_json + write_verilog on the 100k
 # designs for comparison.
 #
 # Usage: bench/run_program.sh [BUILD_DIR] [--yosys]
@@ -55,6 +57,19 @@ if [ -n "$last" ]; then
     measure "qdb2ver $name -tf" "$cells" "$out/net.v" "$build/qdb2ver" -w -verbose -tf "$file" "$out/net.v"
     measure "qdb2ver $name -pf" "$cells" "$out/net.v" "$build/qdb2ver" -w -verbose -pf "$file" "$out/net.v"
     measure "tessel -sta $name (pcs)" "$cells" "$out/net.v" "$build/tessel" -sta -w --verbose "$file" "$out/net.v"
+fi
+# The timing file on the largest compact design: the delays gen_sdf.py
+# writes for it, read and written again (-timing). The row less the plain
+# row of that design is the cost of reading and writing the timing file; its
+# write stage less the plain row's write stage is the timing writer's.
+last=""
+for entry in "${designs[@]}"; do case $entry in gen_*) last=$entry ;; esac; done
+if [ -n "$last" ]; then
+    IFS=: read -r name cells file <<<"$last"
+    sdf="${file%.json}.sdf"
+    make_design "$sdf" python3 "$here/gen_sdf.py" "$cells"
+    measure "qdb2ver $name -timing" "$cells" "$out/net.v" "$build/qdb2ver" -w -verbose \
+        -timing "$sdf" "$file" "$out/net.v"
 fi
 if [ "$yosys_too" = "--yosys" ]; then
     for entry in "${designs[@]}"; do

@@ -247,7 +247,7 @@ int RunProgram(Nlw_Program program, int argc, const char* const* argv) {
     if (!cl.qcfFile.empty() && !Nlw_CheckQcfFile(view, cl.qcfFile.c_str())) return 2;
     std::unique_ptr<Nlw_Timing> timing;
     if (!Nlw_AttachTiming(cl.timing, params, view, writer, timing)) return 2;
-    clock.Trace("Reading the timing");
+    if (timing) clock.Trace("Reading the timing");
     writer.WriteDesign();
     if (!cl.bramDir.empty()) Nlw_WriteBlockRamFiles(writer, cl.bramDir.c_str());
     clock.Trace("Writing");

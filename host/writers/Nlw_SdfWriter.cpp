@@ -102,15 +102,14 @@ void Nlw_SdfWriter::WriteHead(Nlw_NlBlock* scope) {
 // The body is formatted into a block of text handed to the file writer in
 // large pieces: a timing file has several lines per cell, and a line at a
 // time costs more than the formatting.
-void Nlw_SdfWriter::Line(int depth) {
+void Nlw_SdfWriter::Begin(int depth) {
     text_.append(static_cast<size_t>(depth) * kIndentWidth, ' ');
-    text_ += line_;
-    text_ += '\n';
 }
 
 void Nlw_SdfWriter::Line(int depth, const char* text) {
-    line_ = text;
-    Line(depth);
+    Begin(depth);
+    text_ += text;
+    text_ += '\n';
 }
 
 void Nlw_SdfWriter::FlushText(bool always) {
@@ -144,29 +143,28 @@ void Nlw_SdfWriter::WriteEntries(Nlw_NlBlock* scope, const std::vector<uint32_t>
 // INSTANCE, holding INTERCONNECT or PORT entries.
 void Nlw_SdfWriter::WriteNets(Nlw_NlBlock* scope, const std::vector<uint32_t>& nets) {
     Line(1, "(CELL");
-    line_ = "(CELLTYPE \"";
-    line_ += scope->GetTypeName();
-    line_ += "\")";
-    Line(2);
+    Begin(2);
+    text_ += "(CELLTYPE \"";
+    text_ += scope->GetTypeName();
+    text_ += "\")\n";
     Line(2, "(INSTANCE)");
     Line(2, "(DELAY");
     Line(3, "(ABSOLUTE");
     const bool asPorts = timing_->netMode == Nlw_Timing::NetMode::Port;
     for (uint32_t i : nets) {
         const Nlw_TimingEntry& e = timing_->entries[i];
-        line_.clear();
+        Begin(4);
         if (asPorts) {
-            line_ += "(PORT ";
+            text_ += "(PORT ";
             AppendPinPath(e.pin2, scope);
         } else {
-            line_ += "(INTERCONNECT ";
+            text_ += "(INTERCONNECT ";
             AppendPinPath(e.pin1, scope);
-            line_ += ' ';
+            text_ += ' ';
             AppendPinPath(e.pin2, scope);
         }
         AppendValues(e);
-        line_ += ')';
-        Line(4);
+        text_ += ")\n";
         FlushText(false);
     }
     Line(3, ")");
@@ -177,14 +175,14 @@ void Nlw_SdfWriter::WriteNets(Nlw_NlBlock* scope, const std::vector<uint32_t>& n
 void Nlw_SdfWriter::WriteCell(Nlw_NlBlock* scope, Nlw_NlBlock* cell, const uint32_t* first,
                               const uint32_t* last) {
     Line(1, "(CELL");
-    line_ = "(CELLTYPE \"";
-    line_ += cell->GetTypeName();
-    line_ += "\")";
-    Line(2);
-    line_ = "(INSTANCE ";
+    Begin(2);
+    text_ += "(CELLTYPE \"";
+    text_ += cell->GetTypeName();
+    text_ += "\")\n";
+    Begin(2);
+    text_ += "(INSTANCE ";
     AppendInstancePath(cell, scope);
-    line_ += ')';
-    Line(2);
+    text_ += ")\n";
     // Delays first, then checks, each in their own section.
     for (int pass = 0; pass < 2; ++pass) {
         const bool checks = pass == 1;
@@ -197,8 +195,9 @@ void Nlw_SdfWriter::WriteCell(Nlw_NlBlock* scope, Nlw_NlBlock* cell, const uint3
                 Line(2, checks ? "(TIMINGCHECK" : "(DELAY");
                 if (!checks) Line(3, "(ABSOLUTE");
             }
+            Begin(checks ? 3 : 4);
             AppendEntry(e, cell);
-            Line(checks ? 3 : 4);
+            text_ += '\n';
         }
         if (open) {
             if (!checks) Line(3, ")");
@@ -210,13 +209,13 @@ void Nlw_SdfWriter::WriteCell(Nlw_NlBlock* scope, Nlw_NlBlock* cell, const uint3
 }
 
 void Nlw_SdfWriter::AppendEntry(const Nlw_TimingEntry& e, Nlw_NlBlock* cell) {
-    line_ = "(";
-    line_ += Nlw_Timing::Keyword(e.kind);
-    line_ += ' ';
+    text_ += '(';
+    text_ += Nlw_Timing::Keyword(e.kind);
+    text_ += ' ';
     switch (e.kind) {
         case Nlw_TimingKind::IoPath:
             AppendPortTchk(e.pin1, e.edge1, cell);
-            line_ += ' ';
+            text_ += ' ';
             AppendPinPath(e.pin2, cell);
             break;
         case Nlw_TimingKind::Port:
@@ -225,13 +224,13 @@ void Nlw_SdfWriter::AppendEntry(const Nlw_TimingEntry& e, Nlw_NlBlock* cell) {
         default:
             AppendPortTchk(e.pin1, e.edge1, cell);
             if (e.pin2) {
-                line_ += ' ';
+                text_ += ' ';
                 AppendPortTchk(e.pin2, e.edge2, cell);
             }
             break;
     }
     AppendValues(e);
-    line_ += ')';
+    text_ += ')';
 }
 
 void Nlw_SdfWriter::AppendValues(const Nlw_TimingEntry& e) {
@@ -247,10 +246,10 @@ void Nlw_SdfWriter::AppendValues(const Nlw_TimingEntry& e) {
     }
     for (uint8_t k = 0; k < e.numValues; ++k) {
         const Nlw_Rvalue& r = timing_->values[e.firstValue + k];
-        line_ += " (";
+        text_ += " (";
         if (r.present) {
             for (int f = 0; f < 3; ++f) {
-                if (f) line_ += ':';
+                if (f) text_ += ':';
                 if (!(r.present & (1 << f))) continue;
                 double v = r.v[f];
                 if (net) {
@@ -268,7 +267,7 @@ void Nlw_SdfWriter::AppendValues(const Nlw_TimingEntry& e) {
                 AppendNumber(v);
             }
         }
-        line_ += ')';
+        text_ += ')';
     }
 }
 
@@ -278,18 +277,18 @@ void Nlw_SdfWriter::AppendNumber(double ps) {
     char buf[24];
     const long long units = std::llround(ps / unit_);
     char* end = std::to_chars(buf, buf + sizeof buf, units).ptr;
-    line_.append(buf, end);
+    text_.append(buf, end);
 }
 
 void Nlw_SdfWriter::AppendEscaped(const char* name) {
     const char* run = name;
     for (const char* p = name; *p; ++p) {
         if (IsPlain(*p)) continue;
-        line_.append(run, p);
-        line_ += '\\';
+        text_.append(run, p);
+        text_ += '\\';
         run = p;
     }
-    line_ += run;
+    text_ += run;
 }
 
 void Nlw_SdfWriter::AppendInstancePath(const Nlw_NlBlock* block, const Nlw_NlBlock* scope) {
@@ -302,7 +301,7 @@ void Nlw_SdfWriter::AppendInstancePath(const Nlw_NlBlock* block, const Nlw_NlBlo
             pathOwner_ = parent;
             pathScope_ = scope;
             std::string saved;
-            saved.swap(line_);
+            saved.swap(text_);
             const Nlw_NlBlock* chain[64];
             size_t n = 0;
             std::vector<const Nlw_NlBlock*> deep;
@@ -314,16 +313,16 @@ void Nlw_SdfWriter::AppendInstancePath(const Nlw_NlBlock* block, const Nlw_NlBlo
             }
             for (size_t i = deep.size(); i-- > 0;) {
                 AppendEscaped(deep[i]->GetWritableName());
-                line_ += '/';
+                text_ += '/';
             }
             for (size_t i = n; i-- > 0;) {
                 AppendEscaped(chain[i]->GetWritableName());
-                line_ += '/';
+                text_ += '/';
             }
-            pathText_.swap(line_);
-            line_.swap(saved);
+            pathText_.swap(text_);
+            text_.swap(saved);
         }
-        line_ += pathText_;
+        text_ += pathText_;
     }
     AppendEscaped(block->GetWritableName());
 }
@@ -335,10 +334,10 @@ void Nlw_SdfWriter::AppendPinName(const Nlw_NlPin* pin) {
         const char* bracket = std::strrchr(name, '[');
         if (bracket && bracket != name) {
             for (const char* p = name; p != bracket; ++p) {
-                if (!IsPlain(*p)) line_ += '\\';
-                line_ += *p;
+                if (!IsPlain(*p)) text_ += '\\';
+                text_ += *p;
             }
-            line_ += bracket;
+            text_ += bracket;
             return;
         }
     }
@@ -349,7 +348,7 @@ void Nlw_SdfWriter::AppendPinPath(const Nlw_NlPin* pin, const Nlw_NlBlock* scope
     const Nlw_NlBlock* block = pin->GetBlock();
     if (block != scope) {
         AppendInstancePath(block, scope);
-        line_ += '/';
+        text_ += '/';
     }
     AppendPinName(pin);
 }
@@ -360,9 +359,9 @@ void Nlw_SdfWriter::AppendPortTchk(const Nlw_NlPin* pin, uint8_t edge, const Nlw
         AppendPinPath(pin, scope);
         return;
     }
-    line_ += '(';
-    line_ += word;
-    line_ += ' ';
+    text_ += '(';
+    text_ += word;
+    text_ += ' ';
     AppendPinPath(pin, scope);
-    line_ += ')';
+    text_ += ')';
 }

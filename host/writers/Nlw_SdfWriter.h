@@ -34,16 +34,17 @@ private:
     // Writes the entries listed (indexes into the timing data), paths
     // relative to scope.
     void WriteEntries(Nlw_NlBlock* scope, const std::vector<uint32_t>& list);
-    // Appends line_ (or text) as a line of the given depth to the text
-    // block; FlushText hands the block to the file when it is large (or
-    // always).
-    void Line(int depth);
+    // Lines are formatted straight into the text block: Begin indents a
+    // line of the given depth, Line writes a whole one; FlushText hands the
+    // block to the file when it is large (or always).
+    void Begin(int depth);
     void Line(int depth, const char* text);
     void FlushText(bool always);
     void WriteNets(Nlw_NlBlock* scope, const std::vector<uint32_t>& nets);
     void WriteCell(Nlw_NlBlock* scope, Nlw_NlBlock* cell, const uint32_t* first,
                    const uint32_t* last);
-    // The pieces of a line, appended to line_; paths relative to scope.
+    // The pieces of a line, appended to the text block; paths relative to
+    // scope.
     void AppendEntry(const Nlw_TimingEntry& e, Nlw_NlBlock* cell);
     // " (v:v:v)" for each rvalue, with the net delay added when the design
     // asks for net delays folded into paths.
@@ -58,7 +59,6 @@ private:
     void MakeNetDelayIndex();
 
     Nlw_Timing* timing_ = nullptr;
-    std::string line_;
     std::string text_;
     // The escaped path, with its final "/", of the last parent block met.
     const Nlw_NlBlock* pathOwner_ = nullptr;
