@@ -175,7 +175,7 @@ fi
 # ---------------------------------------------------------------------------
 # 3. The shipped library with nominal delays.
 mkdir -p lib/mhf
-if bash "$src/flow/rtl2json" counter_hier lib/ch.json "$tools/designs/counter_hier.v" \
+if bash "$src/flow/rtl2json" counter_hier lib/ch.json "$src/tests/data/designs/counter_hier.v" \
     > lib/rtl2json.log 2>&1; then
     NLW_VERILOG_DEFPARM=1 "$tessel" -w -sta -sdf_anno false -timing nominal lib/ch.json \
         lib/ch.v > lib/tessel.log 2>&1 || fail "tessel -timing nominal"
