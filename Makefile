@@ -44,6 +44,7 @@ test: deps
 # The libFuzzer target over the reader and a whole write into memory, run
 # for FUZZ_SECONDS on the example designs; findings in build-fuzz/fuzz-findings.
 fuzz: deps
+	@$(MAKE) --no-print-directory deps PACKAGES="clang"
 	CXX=clang++ cmake -S . -B $(BUILD_FUZZ) -DCMAKE_BUILD_TYPE=RelWithDebInfo -DNLW_FUZZ=ON -DNLW_TESTS=OFF >/dev/null
 	cmake --build $(BUILD_FUZZ) -j$(JOBS) --target nlw_fuzz_design
 	bash tests/fuzz/run_fuzz.sh $(BUILD_FUZZ) $(FUZZ_SECONDS)
