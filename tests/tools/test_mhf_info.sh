@@ -1,6 +1,7 @@
 #!/usr/bin/env bash
 # The hierarchy information file of a multiple-hierarchy netlist is enough
-# to use the netlist: a three-level design (one module type used twice)
+# to use the netlist: a three-level design (one module type used twice, two
+# types that differ only in case)
 # goes through flow/rtl2json and tessel -sim -mhf; the file list built from the information file alone compiles in
 # Icarus Verilog and simulates cycle by cycle like the single-file netlist;
 # every module block is listed once with its path, module and parent, and
