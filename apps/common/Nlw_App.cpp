@@ -198,8 +198,11 @@ int RunProgram(Nlw_Program program, int argc, const char* const* argv) {
     }
     for (const std::string& warning : cl.ignored) msg.issueWarning("%s", warning.c_str());
 
-    if (const char* dir = params.GetOutputDir()) {
-        // -dir names the folder of the output files; it is made when missing.
+    // The folders of the output files (-dir) and of the timing files
+    // (-sdf_path, when timing is written) are made when missing.
+    for (const char* dir :
+         {params.GetOutputDir(), cl.timing.source.empty() ? nullptr : params.GetSdfPath()}) {
+        if (dir == nullptr || *dir == '\0') continue;
         std::error_code ec;
         std::filesystem::create_directories(dir, ec);
         if (ec) {

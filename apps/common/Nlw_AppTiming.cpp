@@ -7,6 +7,7 @@
 #include <unordered_set>
 #include <vector>
 
+#include "Nlw_HostSteps.h"
 #include "framework/Nlw_NetlistWriter.h"
 #include "framework/Nlw_Params.h"
 #include "framework/Nlw_Timing.h"
@@ -110,6 +111,7 @@ bool Nlw_AttachTiming(const Nlw_TimingOptions& options, Nlw_Params& params, Nlw_
         if (!library.Load(lib)) return false;
         NLW_MSG().issueStatus("Taking nominal delays from '%s' ...\n", lib);
         Nlw_NominalTiming::Make(library, view, *timing);
+        Nlw_ApplySpeedGrade(writer, *timing);
     } else {
         for (const std::string& name : OutputTimingFiles(params, view)) {
             if (SameFile(name, options.source)) {

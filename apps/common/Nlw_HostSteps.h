@@ -10,6 +10,7 @@
 class Nlw_NlView;
 class Nlw_Params;
 class Nlw_NetlistWriter;
+class Nlw_Timing;
 
 // -gp / -tp: brings the global set/reset (setReset true) or tristate net out
 // as an input port of the top module named portName. The net marked as that
@@ -39,3 +40,8 @@ bool Nlw_LoadBlockRamData(Nlw_NetlistWriter& nlw,
 // -bx: writes each block RAM's initial contents as a memory file into dir.
 // False, after one error, when the directory cannot be made.
 bool Nlw_WriteBlockRamFiles(Nlw_NetlistWriter& nlw, const char* dir);
+
+// -s with -timing nominal: scales the nominal delays to the speed grade -s
+// names, by the factor of the device data list "NominalSpeedGrade"; one
+// warning for a grade the list does not give.
+void Nlw_ApplySpeedGrade(Nlw_NetlistWriter& nlw, Nlw_Timing& timing);

@@ -91,6 +91,14 @@ tessel|-module|not|top.v|module chipwide
 tessel|-module -tb|warn||'-tb'
 tessel|-qcf ../opt_top.qcf|warn||NET 'nosuch' is not in the design
 tessel|-pf -s 4|has|top.pin|// Speed 4
+tessel|-timing nominal -s 4|out||Nominal delays of speed grade 4 (x1.25)
+tessel|-timing nominal -s 9|warn||Speed grade 9 has no nominal delays
+qdb2ver|-timing nominal|has|top.sdf|(PROCESS "nominal")
+tessel|-timing nominal|has|top.v|$sdf_annotate("top.sdf")
+tessel|-timing nominal -timing_nets port|has|top.sdf|(PORT
+qdb2ver|-timing nominal -sdf_path sd|has|top.v|$sdf_annotate("sd/top.sdf")
+tessel|-timing nominal -sdf_path sd|file|sd/top.sdf|
+tessel|-timing nominal -sdf_anno false|not|top.v|$sdf_annotate
 tessel|-tb -vcd|has|top.tv|$dumpfile
 tessel|-funcells|out||FUNCELL simulation primitives
 tessel|-funcells -ism|not|top.v|MSGON
