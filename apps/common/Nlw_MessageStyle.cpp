@@ -2,27 +2,9 @@
 
 namespace {
 
-const char* LevelName(Port_MsgLevel level) {
-    switch (level) {
-        case Port_MsgLevel::Debug:
-            return "DEBUG";
-        case Port_MsgLevel::Status:
-            return "STATUS";
-        case Port_MsgLevel::Info:
-            return "INFO";
-        case Port_MsgLevel::Warning:
-            return "WARNING";
-        case Port_MsgLevel::Error:
-            return "ERROR";
-        case Port_MsgLevel::Internal:
-            return "INTERNAL_ERROR";
-    }
-    return "MESSAGE";
-}
-
 // "LEVEL:domain - text" on one line.
 std::string OneLine(const Port_Msg& msg) {
-    std::string line = std::string(LevelName(msg.level)) + ":" + msg.domain + " - ";
+    std::string line = std::string(Port_MsgLevelName(msg.level)) + ":" + msg.domain + " - ";
     std::string text = msg.text;
     while (!text.empty() && (text.back() == '\n' || text.back() == ' ')) text.pop_back();
     for (char& c : text)

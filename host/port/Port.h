@@ -221,6 +221,9 @@ public:
 // Message levels, in the order of their severity.
 enum class Port_MsgLevel { Debug, Status, Info, Warning, Error, Internal };
 
+// The tag of a level in message lines: "WARNING", "INTERNAL_ERROR", ...
+const char* Port_MsgLevelName(Port_MsgLevel level);
+
 // One message as issued: level, domain and the formatted text.
 struct Port_Msg {
     Port_MsgLevel level;

@@ -14,8 +14,16 @@ std::string FormatMessage(const char* format, va_list args) {
     return out;
 }
 
-// The prefix of a level's lines; status lines carry none on the console.
-const char* LevelTag(Port_MsgLevel level) {
+// Writes "prefix + text" with exactly one line end after the text.
+void Emit(FILE* out, const std::string& prefix, const std::string& text) {
+    std::fwrite(prefix.data(), 1, prefix.size(), out);
+    std::fwrite(text.data(), 1, text.size(), out);
+    if (text.empty() || text.back() != '\n') std::fputc('\n', out);
+}
+
+}  // namespace
+
+const char* Port_MsgLevelName(Port_MsgLevel level) {
     switch (level) {
         case Port_MsgLevel::Debug:
             return "DEBUG";
@@ -32,15 +40,6 @@ const char* LevelTag(Port_MsgLevel level) {
     }
     return "MESSAGE";
 }
-
-// Writes "prefix + text" with exactly one line end after the text.
-void Emit(FILE* out, const std::string& prefix, const std::string& text) {
-    std::fwrite(prefix.data(), 1, prefix.size(), out);
-    std::fwrite(text.data(), 1, text.size(), out);
-    if (text.empty() || text.back() != '\n') std::fputc('\n', out);
-}
-
-}  // namespace
 
 Port_MsgManager& Port_MsgManager::Instance() {
     static Port_MsgManager manager;
@@ -78,7 +77,7 @@ void Port_MsgManager::ShowOnConsole(Port_MsgLevel level, const char* domain,
         case Port_MsgLevel::Internal:
             // Keep earlier progress lines ahead of the problem on a terminal.
             std::fflush(stdout);
-            Emit(stderr, std::string(LevelTag(level)) + ":" + domain + " - ", text);
+            Emit(stderr, std::string(Port_MsgLevelName(level)) + ":" + domain + " - ", text);
             break;
     }
 }
@@ -87,7 +86,7 @@ void Port_MsgManager::WriteToLog(Port_MsgLevel level, const char* domain, const 
     if (level == Port_MsgLevel::Debug)
         Emit(log_, "DEBUG: ", text);
     else
-        Emit(log_, std::string(LevelTag(level)) + ":" + domain + " - ", text);
+        Emit(log_, std::string(Port_MsgLevelName(level)) + ":" + domain + " - ", text);
 }
 
 void Port_MsgManager::ResetCounts() {
