@@ -94,6 +94,9 @@ private:
     void WriteWireDeclarations(Nlw_NlBlock* block);
     void WriteWireAssignments(Nlw_NlBlock* block);
     void WriteChipwideDrives(Nlw_NlBlock* block);
+    // Appends the one-bit literal of a constant: 0 and 1, and the reader's
+    // 2 for "x" and 3 for "z".
+    static void AppendBitLiteral(std::string& out, int value);
     void WriteComponentInstantiationStatements(Nlw_NlBlock* block);
     // written: connection lines already begun before the port map (bit-init
     // lines), which the separator rule continues.

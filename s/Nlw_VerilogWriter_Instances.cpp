@@ -19,10 +19,9 @@ void AppendInt(std::string& out, long value) {
     out += std::to_string(value);
 }
 
-// The one-bit literal of a tie-off: 0 and 1, and the reader's 2 for "x" and
-// 3 for "z".
-void AppendTie(std::string& out, const Vdm_Property* tie) {
-    const int value = tie->GetInt32();
+}  // namespace
+
+void Nlw_VerilogWriter::AppendBitLiteral(std::string& out, int value) {
     out += "1'b";
     if (value == 2)
         out += 'x';
@@ -31,8 +30,6 @@ void AppendTie(std::string& out, const Vdm_Property* tie) {
     else
         AppendInt(out, value);
 }
-
-}  // namespace
 
 void Nlw_VerilogWriter::WriteComponentInstantiationStatements(Nlw_NlBlock* block) {
     Nlw_NetlistWriter* nlw = GetNlw();
@@ -127,7 +124,7 @@ void Nlw_VerilogWriter::WritePortMaps(Nlw_NlBlock* instance, int written) {
             line_ = '.';
             line_ += nlw->Escape(pin.GetWritableName(), 0);
             line_ += '(';
-            AppendTie(line_, tie);
+            AppendBitLiteral(line_, tie->GetInt32());
             line_ += ')';
             WriteI(line_.c_str());
         }
@@ -161,7 +158,7 @@ void Nlw_VerilogWriter::WritePortMaps(Nlw_NlBlock* instance, int written) {
                     line_ += nlw->Escape(signal->GetWritableName(), signal->IsBused() ? 1 : 0);
                     anyBit = true;
                 } else if (bit && (tie = TieOff(bit))) {
-                    AppendTie(line_, tie);
+                    AppendBitLiteral(line_, tie->GetInt32());
                     anyBit = true;
                 } else {
                     // No net and no constant: the bit floats. The reader gives

@@ -82,8 +82,8 @@ void Nlw_VerilogWriter::WriteWireAssignments(Nlw_NlBlock* block) {
             WriteL(",");
         }
         line_ = nlw->Escape(signal->GetWritableName(), signal->IsBused() ? 1 : 0);
-        const int value = constant->GetInt32();
-        line_ += value == 2 ? " = 1'bx" : value == 1 ? " = 1'b1" : " = 1'b0";
+        line_ += " = ";
+        AppendBitLiteral(line_, constant->GetInt32());
         WriteI(line_.c_str());
     }
 

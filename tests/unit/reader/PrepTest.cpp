@@ -3,6 +3,7 @@
 #include <cmath>
 #include <memory>
 
+#include "HostTestSupport.h"
 #include "ReaderTestSupport.h"
 #include "framework/Nlw_NetlistWriter.h"
 #include "framework/Nlw_Util.h"
@@ -119,16 +120,8 @@ TEST(PrepLiteral, WritesTheFileValueAsAVerilogLiteral) {
 }
 
 // Records what the pass offers and accepts it as the given text.
-class RecordingWriter : public Nlw_NetlistWriter {
+class RecordingWriter : public hosttest::StubNetlistWriter {
 public:
-    HelpFunction GetHelp() override { return nullptr; }
-    const char** GetReservedWords() override { return nullptr; }
-    unsigned char IsEscaped(const char*) override { return 0; }
-    const char* Escape(const char* name, unsigned char) override { return name; }
-    const char* GetRangeString(Nlw_NlBus*) override { return ""; }
-    const char* GetIndexesString(DARRAY_Util_INT32*) override { return ""; }
-    void WriteDesign() override {}
-    void WriteHeader(Nlw_Writer*) override {}
     unsigned char AddIfSimulatableProperty(Nlw_NlBlock* block, Vdm_Property* p,
                                            Vdm_Property* list) override {
         offered.push_back(std::string(block->GetInstanceName()) + "." + p->GetName() + "=" +
