@@ -59,14 +59,12 @@ Text TextPool::Keep(std::string_view s) {
 
 void Design::ReleaseDocument() {
     for (Module& m : modules) {
-        m.name = m.nameText;
         m.json = simdjson::dom::object();
         std::unordered_map<std::string_view, uint32_t>().swap(m.portIndex);
     }
     for (LibType& lt : types) std::unordered_map<std::string_view, uint32_t>().swap(lt.pinIndex);
     std::unordered_map<std::string_view, uint32_t>().swap(moduleIndex);
     std::unordered_map<std::string_view, uint32_t>().swap(typeIndex);
-    root = simdjson::dom::element();
     parser = simdjson::dom::parser();
     scratch = NameScratch();
 }
@@ -152,14 +150,12 @@ std::string Position(const char* text, size_t len, size_t offset) {
     return "line " + std::to_string(line) + ", column " + std::to_string(col);
 }
 
-void Parse(Design& d, const Input& text) {
-    simdjson::error_code err =
-        d.parser.parse(reinterpret_cast<const uint8_t*>(text.data()), text.size(), false)
-            .get(d.root);
-    if (!err) return;
+}  // namespace
+
+void FailParse(const Design& d, simdjson::error_code err) {
     if (err == simdjson::MEMALLOC) throw std::bad_alloc();
     std::string what = simdjson::error_message(err);
-    size_t at = FindSyntaxError(text.data(), text.size());
+    size_t at = FindSyntaxError(d.text, d.textLen);
     // A number the syntax allows that the parser still refuses does not fit
     // in 64 bits.
     if (at == std::string::npos &&
@@ -167,19 +163,24 @@ void Parse(Design& d, const Input& text) {
         Fail("number out of range: a number in the file does not fit in 64 bits");
     if (at != std::string::npos)
         Fail("malformed JSON at byte offset " + std::to_string(at) + " (" +
-             Position(text.data(), text.size(), at) + "): " + what);
+             Position(d.text, d.textLen, at) + "): " + what);
     Fail("malformed JSON: " + what);
 }
 
+namespace {
+
 bool Run(Design& d, Input& text, Nlw_NlView& view, std::unique_ptr<Nlw_Design>& design) {
     try {
-        Parse(d, text);
-        // The document holds its own copy of every string; the text can go.
-        text.Release();
+        d.text = text.data();
+        d.textLen = text.size();
         ReadModuleList(d);
         ResolveHierarchy(d);
-        CheckUnfoldedSize(d);
+        // The digests hold their own copy of every text they need.
         d.ReleaseDocument();
+        d.text = nullptr;
+        d.textLen = 0;
+        text.Release();
+        CheckUnfoldedSize(d);
         if (d.options.flatten)
             BuildFlat(d, view);
         else

@@ -153,8 +153,11 @@ struct GlobalNet {
 };
 
 struct Module {
-    std::string_view name;  // in the document, while it lives
+    std::string_view name;  // nameText
     Text nameText = "";
+    // Where the module's object lies in the text, and the object while it
+    // is the one parsed (see OpenModule).
+    size_t textBegin = 0, textEnd = 0;
     simdjson::dom::object json;
     bool blackbox = false;
     bool topAttr = false;
@@ -270,8 +273,10 @@ struct NameScratch {
 struct Design {
     std::string fileName;
     Nlw_ReadOptions options;
+    // The text of the file, padded for the parser, while it is read.
+    const char* text = nullptr;
+    size_t textLen = 0;
     simdjson::dom::parser parser;
-    simdjson::dom::element root;
     TextPool pool;
     std::vector<Module> modules;
     std::unordered_map<std::string_view, uint32_t> moduleIndex;
@@ -290,6 +295,16 @@ struct Design {
     // indexes that point into it go with it.
     void ReleaseDocument();
 };
+
+// Finding and parsing the modules (Nlw_JsonReader_Split.cpp). SplitModules
+// lists the modules of the text with their names and places; OpenModule
+// parses one of them into m.json, which stays valid until the next module
+// is opened.
+void SplitModules(Design& d);
+void OpenModule(Design& d, Module& m);
+// Parses the whole text; a fault ends the load with its message.
+void ParseWhole(Design& d);
+[[noreturn]] void FailParse(const Design& d, simdjson::error_code err);
 
 // Reading the document (Nlw_JsonReader_Modules.cpp, Nlw_JsonReader_Cells.cpp).
 // The module list with every module's attributes, ports and children.

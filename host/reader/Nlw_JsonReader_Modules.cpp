@@ -6,6 +6,7 @@
 #include <cstdio>
 #include <cstdlib>
 #include <limits>
+#include <memory>
 #include <unordered_map>
 
 #include "reader/Nlw_JsonReader_Internal.h"
@@ -150,7 +151,7 @@ void ReadPorts(Design& d, Module& m) {
         p.bitFirst = static_cast<uint32_t>(m.refs.size());
         p.width = ReadBits(e, m, where);
         ReadRange(po, p.width, where, p.msb, p.lsb);
-        if (!m.portIndex.emplace(name, static_cast<uint32_t>(m.ports.size())).second)
+        if (!m.portIndex.emplace(p.name, static_cast<uint32_t>(m.ports.size())).second)
             Fail(where.Text() + ": given twice");
         p.pinPos = m.numPins;
         m.numPins += p.width;
@@ -174,7 +175,9 @@ void ReadModuleAttrs(Module& m, TextPool& pool) {
     }
 }
 
-// The modules a module instantiates, each once, in cell order.
+// The modules a module instantiates, each once, in cell order. Whether a
+// child is a black box is known only when every module's attributes are
+// read, so those are dropped later (DropBlackboxChildren).
 void ReadChildren(Design& d, Module& m, uint32_t self, std::vector<uint32_t>& stamp) {
     Where where{m.name, {}, {}, {}};
     object cells;
@@ -192,11 +195,17 @@ void ReadChildren(Design& d, Module& m, uint32_t self, std::vector<uint32_t>& st
         if (type == last) continue;
         last = type;
         auto it = d.moduleIndex.find(PublicName(type));
-        if (it == d.moduleIndex.end() || d.modules[it->second].blackbox) continue;
+        if (it == d.moduleIndex.end()) continue;
         if (stamp[it->second] == self + 1) continue;
         stamp[it->second] = self + 1;
         m.children.push_back(it->second);
     }
+}
+
+void DropBlackboxChildren(Design& d, Module& m) {
+    auto& ch = m.children;
+    ch.erase(std::remove_if(ch.begin(), ch.end(), [&](uint32_t c) { return d.modules[c].blackbox; }),
+             ch.end());
 }
 
 template <typename T>
@@ -376,33 +385,37 @@ bool ValueToInt(const Value& v, int64_t& out) {
 }
 
 void ReadModuleList(Design& d) {
-    object top;
-    if (d.root.get_object().get(top)) Fail("expected a JSON object at the top level");
-    element e;
-    object mods;
-    if (top.at_key("modules").get(e) || e.get_object().get(mods))
-        Fail("no modules (expected an object \"modules\")");
-    d.modules.reserve(mods.size());
-    for (auto kv : mods) {
-        Module m;
-        m.name = PublicName(kv.key);
-        m.nameText = d.pool.Keep(m.name);
-        if (kv.value.get_object().get(m.json))
-            Fail("module '" + std::string(m.name) + "': expected an object");
-        if (!d.moduleIndex.emplace(m.name, static_cast<uint32_t>(d.modules.size())).second)
-            Fail("module '" + std::string(m.name) + "' is defined twice");
-        d.modules.push_back(std::move(m));
-    }
+    SplitModules(d);
+    for (uint32_t i = 0; i < d.modules.size(); ++i)
+        if (!d.moduleIndex.emplace(d.modules[i].name, i).second) {
+            // A fault of the text anywhere is reported first.
+            for (Module& m : d.modules) OpenModule(d, m);
+            Fail("module '" + std::string(d.modules[i].name) + "' is defined twice");
+        }
     if (d.modules.empty()) Fail("no modules");
-    for (Module& m : d.modules) ReadModuleAttrs(m, d.pool);
+    // Each module is parsed once here and once more when it is digested.
+    // The first fault of a module's content is reported only when every
+    // module has been parsed, so that a fault of the text comes first.
     std::vector<uint32_t> stamp(d.modules.size(), 0);
+    std::unique_ptr<ReadError> first;
     for (uint32_t i = 0; i < d.modules.size(); ++i) {
-        ReadPorts(d, d.modules[i]);
-        ReadChildren(d, d.modules[i], i, stamp);
+        Module& m = d.modules[i];
+        OpenModule(d, m);
+        if (first) continue;
+        try {
+            ReadModuleAttrs(m, d.pool);
+            ReadPorts(d, m);
+            ReadChildren(d, m, i, stamp);
+        } catch (ReadError& e) {
+            first = std::make_unique<ReadError>(std::move(e));
+        }
     }
+    if (first) throw *first;
+    for (Module& m : d.modules) DropBlackboxChildren(d, m);
 }
 
 void DigestModule(Design& d, Module& m) {
+    OpenModule(d, m);
     Where where{m.name, {}, "net", {}};
     std::vector<NetEntry>& entries = d.scratch.entries;
     entries.clear();

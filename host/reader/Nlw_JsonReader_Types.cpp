@@ -64,7 +64,7 @@ uint32_t FindOrAddLibType(Design& d, std::string_view name) {
             PinsFromBlackbox(lt, d.modules[mit->second]);
         }
     }
-    d.typeIndex.emplace(name, idx);
+    d.typeIndex.emplace(lt.name, idx);
     return idx;
 }
 

@@ -1,0 +1,210 @@
+// The document is parsed one module at a time. A netlist JSON file is one
+// object whose "modules" member holds every module; parsed whole, its tape
+// and strings take about twice the file's size, while no module is more
+// than a small part of it. So a scan of the top level finds where each
+// module's object lies in the text, and each is handed to the parser on
+// its own when it is read, reusing the parser's buffers.
+//
+// The scan only steps over the text between the modules; the parser checks
+// every byte of it. A fault anywhere is reported as a parse of the whole
+// document reports it, with the byte offset and position in the file.
+#include <cstring>
+
+#include "reader/Nlw_JsonReader_Internal.h"
+
+namespace nlw_json {
+
+namespace {
+
+bool IsSpace(char c) {
+    return c == ' ' || c == '\t' || c == '\n' || c == '\r';
+}
+
+class TopScan {
+public:
+    TopScan(const char* text, size_t len) : t_(text), n_(len) {}
+
+    size_t SkipSpace(size_t i) const {
+        while (i < n_ && IsSpace(t_[i])) ++i;
+        return i;
+    }
+
+    // The end of the string that opens at i, or npos.
+    size_t StringEnd(size_t i) const {
+        for (++i; i < n_; ++i) {
+            const void* hit = std::memchr(t_ + i, '"', n_ - i);
+            if (!hit) return npos;
+            size_t q = static_cast<const char*>(hit) - t_;
+            size_t slashes = 0;
+            while (q - slashes > i && t_[q - slashes - 1] == '\\') ++slashes;
+            if (slashes % 2 == 0) return q + 1;
+            i = q;
+        }
+        return npos;
+    }
+
+    // The end of the value that begins at i, or npos. Strings are stepped
+    // over whole, so brackets inside them do not count.
+    size_t ValueEnd(size_t i) const {
+        if (i >= n_) return npos;
+        if (t_[i] == '"') return StringEnd(i);
+        if (t_[i] != '{' && t_[i] != '[') {
+            while (i < n_ && !IsSpace(t_[i]) && t_[i] != ',' && t_[i] != '}' && t_[i] != ']')
+                ++i;
+            return i;
+        }
+        size_t depth = 0;
+        for (; i < n_; ++i) {
+            const char c = t_[i];
+            if (c == '"') {
+                i = StringEnd(i);
+                if (i == npos) return npos;
+                --i;
+            } else if (c == '{' || c == '[') {
+                ++depth;
+            } else if (c == '}' || c == ']') {
+                if (--depth == 0) return i + 1;
+            }
+        }
+        return npos;
+    }
+
+    static constexpr size_t npos = std::string::npos;
+
+private:
+    const char* t_;
+    size_t n_;
+};
+
+// Stops the load with the message a parse of the whole document gives.
+[[noreturn]] void FailWhole(Design& d, const char* what) {
+    ParseWhole(d);
+    Fail(what);
+}
+
+// A key as the parser reads it: the text between the quotes, or, when it
+// holds an escape, its decoded form in the pool.
+std::string_view KeyText(Design& d, const char* text, size_t begin, size_t end) {
+    std::string_view raw(text + begin + 1, end - begin - 2);
+    if (raw.find('\\') == std::string_view::npos) return raw;
+    std::string_view decoded;
+    simdjson::dom::element e;
+    if (d.parser.parse(reinterpret_cast<const uint8_t*>(text + begin), end - begin, false).get(e) ||
+        e.get_string().get(decoded))
+        FailWhole(d, "malformed JSON: a bad key");
+    return d.pool.Keep(decoded);
+}
+
+// Checks a value outside the modules by parsing it on its own.
+void CheckValue(Design& d, size_t begin, size_t end) {
+    simdjson::dom::element e;
+    if (d.parser.parse(reinterpret_cast<const uint8_t*>(d.text + begin), end - begin, false).get(e))
+        FailWhole(d, "malformed JSON");
+}
+
+void ScanModules(Design& d, const TopScan& s, size_t i) {
+    // i is at the "{" of "modules".
+    i = s.SkipSpace(i + 1);
+    if (i < d.textLen && d.text[i] == '}') return;
+    for (;;) {
+        if (i >= d.textLen || d.text[i] != '"') FailWhole(d, "malformed JSON");
+        size_t keyEnd = s.StringEnd(i);
+        if (keyEnd == TopScan::npos) FailWhole(d, "malformed JSON");
+        Module m;
+        m.name = PublicName(KeyText(d, d.text, i, keyEnd));
+        i = s.SkipSpace(keyEnd);
+        if (i >= d.textLen || d.text[i] != ':') FailWhole(d, "malformed JSON");
+        i = s.SkipSpace(i + 1);
+        size_t end = s.ValueEnd(i);
+        if (end == TopScan::npos) FailWhole(d, "malformed JSON");
+        m.textBegin = i;
+        m.textEnd = end;
+        m.nameText = d.pool.Keep(m.name);
+        m.name = m.nameText;
+        d.modules.push_back(std::move(m));
+        i = s.SkipSpace(end);
+        if (i < d.textLen && d.text[i] == ',') {
+            i = s.SkipSpace(i + 1);
+            continue;
+        }
+        if (i < d.textLen && d.text[i] == '}') return;
+        FailWhole(d, "malformed JSON");
+    }
+}
+
+}  // namespace
+
+void ParseWhole(Design& d) {
+    simdjson::dom::parser whole;
+    simdjson::dom::element root;
+    simdjson::error_code err =
+        whole.parse(reinterpret_cast<const uint8_t*>(d.text), d.textLen, false).get(root);
+    if (err) FailParse(d, err);
+}
+
+void SplitModules(Design& d) {
+    TopScan s(d.text, d.textLen);
+    size_t i = s.SkipSpace(0);
+    if (i >= d.textLen || d.text[i] != '{') FailWhole(d, "expected a JSON object at the top level");
+    i = s.SkipSpace(i + 1);
+    bool found = false, scanned = false;
+    if (i < d.textLen && d.text[i] == '}') {
+        ++i;
+    } else {
+        for (;;) {
+            if (i >= d.textLen || d.text[i] != '"') FailWhole(d, "malformed JSON");
+            size_t keyEnd = s.StringEnd(i);
+            if (keyEnd == TopScan::npos) FailWhole(d, "malformed JSON");
+            const bool isModules = KeyText(d, d.text, i, keyEnd) == "modules";
+            i = s.SkipSpace(keyEnd);
+            if (i >= d.textLen || d.text[i] != ':') FailWhole(d, "malformed JSON");
+            i = s.SkipSpace(i + 1);
+            size_t end = s.ValueEnd(i);
+            if (end == TopScan::npos) FailWhole(d, "malformed JSON");
+            // The first "modules" member is the one read, as a lookup by
+            // key finds it; the rest of the top level is only checked.
+            if (isModules && !found) {
+                found = true;
+                if (d.text[i] == '{') {
+                    ScanModules(d, s, i);
+                    scanned = true;
+                } else {
+                    CheckValue(d, i, end);
+                }
+            } else {
+                CheckValue(d, i, end);
+            }
+            i = s.SkipSpace(end);
+            if (i < d.textLen && d.text[i] == ',') {
+                i = s.SkipSpace(i + 1);
+                continue;
+            }
+            if (i < d.textLen && d.text[i] == '}') {
+                ++i;
+                break;
+            }
+            FailWhole(d, "malformed JSON");
+        }
+    }
+    if (s.SkipSpace(i) != d.textLen) FailWhole(d, "malformed JSON");
+    if (!scanned) {
+        // A "modules" member that is not an object may still hide a fault
+        // of the text elsewhere; those are reported first.
+        ParseWhole(d);
+        Fail("no modules (expected an object \"modules\")");
+    }
+}
+
+void OpenModule(Design& d, Module& m) {
+    simdjson::dom::element e;
+    simdjson::error_code err = d.parser
+                                   .parse(reinterpret_cast<const uint8_t*>(d.text + m.textBegin),
+                                          m.textEnd - m.textBegin, false)
+                                   .get(e);
+    if (err == simdjson::MEMALLOC) throw std::bad_alloc();
+    if (err) FailWhole(d, "malformed JSON");
+    if (e.get_object().get(m.json))
+        Fail("module '" + std::string(m.name) + "': expected an object");
+}
+
+}  // namespace nlw_json
