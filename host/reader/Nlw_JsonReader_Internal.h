@@ -276,6 +276,7 @@ struct Design {
     // The text of the file, padded for the parser, while it is read.
     const char* text = nullptr;
     size_t textLen = 0;
+    bool exactSplit = false;
     simdjson::dom::parser parser;
     TextPool pool;
     std::vector<Module> modules;
@@ -299,8 +300,11 @@ struct Design {
 // Finding and parsing the modules (Nlw_JsonReader_Split.cpp). SplitModules
 // lists the modules of the text with their names and places; OpenModule
 // parses one of them into m.json, which stays valid until the next module
-// is opened.
-void SplitModules(Design& d);
+// is opened. Unless exact, the places are judged by the layout, and a
+// wrong judgement shows as GuessFailed, from either, before any module is
+// digested; the list is then made again, exactly.
+struct GuessFailed {};
+void SplitModules(Design& d, bool exact);
 void OpenModule(Design& d, Module& m);
 // Parses the whole text; a fault ends the load with its message.
 void ParseWhole(Design& d);

@@ -384,8 +384,10 @@ bool ValueToInt(const Value& v, int64_t& out) {
     return false;
 }
 
-void ReadModuleList(Design& d) {
-    SplitModules(d);
+namespace {
+
+void ReadModuleListOnce(Design& d) {
+    SplitModules(d, d.exactSplit);
     for (uint32_t i = 0; i < d.modules.size(); ++i)
         if (!d.moduleIndex.emplace(d.modules[i].name, i).second) {
             // A fault of the text anywhere is reported first.
@@ -412,6 +414,21 @@ void ReadModuleList(Design& d) {
     }
     if (first) throw *first;
     for (Module& m : d.modules) DropBlackboxChildren(d, m);
+}
+
+}  // namespace
+
+void ReadModuleList(Design& d) {
+    try {
+        ReadModuleListOnce(d);
+    } catch (const GuessFailed&) {
+        d.modules.clear();
+        d.moduleIndex.clear();
+        d.exactSplit = true;
+        ReadModuleListOnce(d);
+    }
+    // Every module's range has parsed: any later fault is the text's.
+    d.exactSplit = true;
 }
 
 void DigestModule(Design& d, Module& m) {

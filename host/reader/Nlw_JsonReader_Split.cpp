@@ -69,6 +69,24 @@ public:
         return npos;
     }
 
+    // Where the object that opens at i most likely ends, judged by the
+    // layout: an object whose key begins a line ends where a line of the
+    // same indentation begins with "}". A raw line break cannot lie inside
+    // a string, so the guess is never inside one; whether it is the
+    // object's end is settled by parsing the range, which succeeds only
+    // when it holds exactly one object. npos when the text has no such line.
+    size_t GuessObjectEnd(size_t keyBegin, size_t i) const {
+        size_t indent = 0;
+        while (indent < keyBegin && t_[keyBegin - indent - 1] == ' ') ++indent;
+        if (indent >= keyBegin || t_[keyBegin - indent - 1] != '\n' || indent > 64) return npos;
+        char close[66];
+        close[0] = '\n';
+        std::memset(close + 1, ' ', indent);
+        close[indent + 1] = '}';
+        const void* hit = memmem(t_ + i, n_ - i, close, indent + 2);
+        return hit ? static_cast<const char*>(hit) - t_ + indent + 2 : npos;
+    }
+
     static constexpr size_t npos = std::string::npos;
 
 private:
@@ -102,7 +120,7 @@ void CheckValue(Design& d, size_t begin, size_t end) {
         FailWhole(d, "malformed JSON");
 }
 
-void ScanModules(Design& d, const TopScan& s, size_t i) {
+void ScanModules(Design& d, const TopScan& s, size_t i, bool exact) {
     // i is at the "{" of "modules".
     i = s.SkipSpace(i + 1);
     if (i < d.textLen && d.text[i] == '}') return;
@@ -114,8 +132,10 @@ void ScanModules(Design& d, const TopScan& s, size_t i) {
         m.name = PublicName(KeyText(d, d.text, i, keyEnd));
         i = s.SkipSpace(keyEnd);
         if (i >= d.textLen || d.text[i] != ':') FailWhole(d, "malformed JSON");
+        const size_t keyBegin = i;
         i = s.SkipSpace(i + 1);
-        size_t end = s.ValueEnd(i);
+        size_t end = exact || d.text[i] != '{' ? TopScan::npos : s.GuessObjectEnd(keyBegin, i);
+        if (end == TopScan::npos) end = s.ValueEnd(i);
         if (end == TopScan::npos) FailWhole(d, "malformed JSON");
         m.textBegin = i;
         m.textEnd = end;
@@ -128,6 +148,7 @@ void ScanModules(Design& d, const TopScan& s, size_t i) {
             continue;
         }
         if (i < d.textLen && d.text[i] == '}') return;
+        if (!exact) throw GuessFailed{};
         FailWhole(d, "malformed JSON");
     }
 }
@@ -142,7 +163,7 @@ void ParseWhole(Design& d) {
     if (err) FailParse(d, err);
 }
 
-void SplitModules(Design& d) {
+void SplitModules(Design& d, bool exact) {
     TopScan s(d.text, d.textLen);
     size_t i = s.SkipSpace(0);
     if (i >= d.textLen || d.text[i] != '{') FailWhole(d, "expected a JSON object at the top level");
@@ -166,7 +187,7 @@ void SplitModules(Design& d) {
             if (isModules && !found) {
                 found = true;
                 if (d.text[i] == '{') {
-                    ScanModules(d, s, i);
+                    ScanModules(d, s, i, exact);
                     scanned = true;
                 } else {
                     CheckValue(d, i, end);
@@ -202,6 +223,7 @@ void OpenModule(Design& d, Module& m) {
                                           m.textEnd - m.textBegin, false)
                                    .get(e);
     if (err == simdjson::MEMALLOC) throw std::bad_alloc();
+    if (err && !d.exactSplit) throw GuessFailed{};
     if (err) FailWhole(d, "malformed JSON");
     if (e.get_object().get(m.json))
         Fail("module '" + std::string(m.name) + "': expected an object");
