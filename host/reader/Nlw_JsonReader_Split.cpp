@@ -10,6 +10,10 @@
 // document reports it, with the byte offset and position in the file.
 #include <cstring>
 
+#if defined(__SSE2__)
+#include <emmintrin.h>
+#endif
+
 #include "reader/Nlw_JsonReader_Internal.h"
 
 namespace nlw_json {
@@ -83,13 +87,37 @@ public:
         close[0] = '\n';
         std::memset(close + 1, ' ', indent);
         close[indent + 1] = '}';
-        const void* hit = memmem(t_ + i, n_ - i, close, indent + 2);
-        return hit ? static_cast<const char*>(hit) - t_ + indent + 2 : npos;
+        const size_t hit = Find(i, close, indent + 2);
+        return hit == npos ? npos : hit + indent + 2;
     }
 
     static constexpr size_t npos = std::string::npos;
 
 private:
+    // The first place at or after i where needle (at least 2 bytes) begins.
+    // Blocks of 16 places are tested at once on the needle's first and last
+    // bytes, and only the places where both agree are compared whole.
+    size_t Find(size_t i, const char* needle, size_t len) const {
+#if defined(__SSE2__)
+        const __m128i first = _mm_set1_epi8(needle[0]);
+        const __m128i last = _mm_set1_epi8(needle[len - 1]);
+        for (; i + len - 1 + 16 <= n_; i += 16) {
+            const __m128i a = _mm_loadu_si128(reinterpret_cast<const __m128i*>(t_ + i));
+            const __m128i b = _mm_loadu_si128(reinterpret_cast<const __m128i*>(t_ + i + len - 1));
+            unsigned mask = static_cast<unsigned>(
+                _mm_movemask_epi8(_mm_and_si128(_mm_cmpeq_epi8(a, first), _mm_cmpeq_epi8(b, last))));
+            while (mask) {
+                const unsigned bit = static_cast<unsigned>(__builtin_ctz(mask));
+                if (std::memcmp(t_ + i + bit + 1, needle + 1, len - 2) == 0) return i + bit;
+                mask &= mask - 1;
+            }
+        }
+#endif
+        for (; i + len <= n_; ++i)
+            if (t_[i] == needle[0] && std::memcmp(t_ + i, needle, len) == 0) return i;
+        return npos;
+    }
+
     const char* t_;
     size_t n_;
 };
@@ -120,19 +148,20 @@ void CheckValue(Design& d, size_t begin, size_t end) {
         FailWhole(d, "malformed JSON");
 }
 
-void ScanModules(Design& d, const TopScan& s, size_t i, bool exact) {
-    // i is at the "{" of "modules".
+// Lists the modules of the "modules" object that opens at i; returns the
+// place after its end.
+size_t ScanModules(Design& d, const TopScan& s, size_t i, bool exact) {
     i = s.SkipSpace(i + 1);
-    if (i < d.textLen && d.text[i] == '}') return;
+    if (i < d.textLen && d.text[i] == '}') return i + 1;
     for (;;) {
         if (i >= d.textLen || d.text[i] != '"') FailWhole(d, "malformed JSON");
+        const size_t keyBegin = i;
         size_t keyEnd = s.StringEnd(i);
         if (keyEnd == TopScan::npos) FailWhole(d, "malformed JSON");
         Module m;
         m.name = PublicName(KeyText(d, d.text, i, keyEnd));
         i = s.SkipSpace(keyEnd);
         if (i >= d.textLen || d.text[i] != ':') FailWhole(d, "malformed JSON");
-        const size_t keyBegin = i;
         i = s.SkipSpace(i + 1);
         size_t end = exact || d.text[i] != '{' ? TopScan::npos : s.GuessObjectEnd(keyBegin, i);
         if (end == TopScan::npos) end = s.ValueEnd(i);
@@ -147,7 +176,7 @@ void ScanModules(Design& d, const TopScan& s, size_t i, bool exact) {
             i = s.SkipSpace(i + 1);
             continue;
         }
-        if (i < d.textLen && d.text[i] == '}') return;
+        if (i < d.textLen && d.text[i] == '}') return i + 1;
         if (!exact) throw GuessFailed{};
         FailWhole(d, "malformed JSON");
     }
@@ -180,21 +209,18 @@ void SplitModules(Design& d, bool exact) {
             i = s.SkipSpace(keyEnd);
             if (i >= d.textLen || d.text[i] != ':') FailWhole(d, "malformed JSON");
             i = s.SkipSpace(i + 1);
-            size_t end = s.ValueEnd(i);
-            if (end == TopScan::npos) FailWhole(d, "malformed JSON");
             // The first "modules" member is the one read, as a lookup by
             // key finds it; the rest of the top level is only checked.
-            if (isModules && !found) {
-                found = true;
-                if (d.text[i] == '{') {
-                    ScanModules(d, s, i, exact);
-                    scanned = true;
-                } else {
-                    CheckValue(d, i, end);
-                }
+            size_t end;
+            if (isModules && !found && d.text[i] == '{') {
+                end = ScanModules(d, s, i, exact);
+                scanned = true;
             } else {
+                end = s.ValueEnd(i);
+                if (end == TopScan::npos) FailWhole(d, "malformed JSON");
                 CheckValue(d, i, end);
             }
+            found = found || isModules;
             i = s.SkipSpace(end);
             if (i < d.textLen && d.text[i] == ',') {
                 i = s.SkipSpace(i + 1);
