@@ -204,8 +204,9 @@ void ReadChildren(Design& d, Module& m, uint32_t self, std::vector<uint32_t>& st
 
 void DropBlackboxChildren(Design& d, Module& m) {
     auto& ch = m.children;
-    ch.erase(std::remove_if(ch.begin(), ch.end(), [&](uint32_t c) { return d.modules[c].blackbox; }),
-             ch.end());
+    ch.erase(
+        std::remove_if(ch.begin(), ch.end(), [&](uint32_t c) { return d.modules[c].blackbox; }),
+        ch.end());
 }
 
 template <typename T>

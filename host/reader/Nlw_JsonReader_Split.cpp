@@ -53,8 +53,7 @@ public:
         if (i >= n_) return npos;
         if (t_[i] == '"') return StringEnd(i);
         if (t_[i] != '{' && t_[i] != '[') {
-            while (i < n_ && !IsSpace(t_[i]) && t_[i] != ',' && t_[i] != '}' && t_[i] != ']')
-                ++i;
+            while (i < n_ && !IsSpace(t_[i]) && t_[i] != ',' && t_[i] != '}' && t_[i] != ']') ++i;
             return i;
         }
         size_t depth = 0;
@@ -104,8 +103,8 @@ private:
         for (; i + len - 1 + 16 <= n_; i += 16) {
             const __m128i a = _mm_loadu_si128(reinterpret_cast<const __m128i*>(t_ + i));
             const __m128i b = _mm_loadu_si128(reinterpret_cast<const __m128i*>(t_ + i + len - 1));
-            unsigned mask = static_cast<unsigned>(
-                _mm_movemask_epi8(_mm_and_si128(_mm_cmpeq_epi8(a, first), _mm_cmpeq_epi8(b, last))));
+            unsigned mask = static_cast<unsigned>(_mm_movemask_epi8(
+                _mm_and_si128(_mm_cmpeq_epi8(a, first), _mm_cmpeq_epi8(b, last))));
             while (mask) {
                 const unsigned bit = static_cast<unsigned>(__builtin_ctz(mask));
                 if (std::memcmp(t_ + i + bit + 1, needle + 1, len - 2) == 0) return i + bit;
