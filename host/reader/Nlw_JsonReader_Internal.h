@@ -300,11 +300,11 @@ struct Design {
 // Finding and parsing the modules (Nlw_JsonReader_Split.cpp). SplitModules
 // lists the modules of the text with their names and places; OpenModule
 // parses one of them into m.json, which stays valid until the next module
-// is opened. Unless exact, the places are judged by the layout, and a
-// wrong judgement shows as GuessFailed, from either, before any module is
-// digested; the list is then made again, exactly.
+// is opened. Unless Design::exactSplit, the places are judged by the
+// layout, and any fault met shows as GuessFailed, from either, before any
+// module is digested; the list is then made again, exactly.
 struct GuessFailed {};
-void SplitModules(Design& d, bool exact);
+void SplitModules(Design& d);
 void OpenModule(Design& d, Module& m);
 // Parses the whole text; a fault ends the load with its message.
 void ParseWhole(Design& d);

@@ -388,7 +388,7 @@ bool ValueToInt(const Value& v, int64_t& out) {
 namespace {
 
 void ReadModuleListOnce(Design& d) {
-    SplitModules(d, d.exactSplit);
+    SplitModules(d);
     for (uint32_t i = 0; i < d.modules.size(); ++i)
         if (!d.moduleIndex.emplace(d.modules[i].name, i).second) {
             // A fault of the text anywhere is reported first.

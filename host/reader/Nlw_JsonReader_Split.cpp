@@ -122,7 +122,11 @@ private:
 };
 
 // Stops the load with the message a parse of the whole document gives.
+// While the places of the modules are judged by the layout, a fault may be
+// the judgement's: the list is then made again, exactly, and a fault of the
+// text shows there.
 [[noreturn]] void FailWhole(Design& d, const char* what) {
+    if (!d.exactSplit) throw GuessFailed{};
     ParseWhole(d);
     Fail(what);
 }
@@ -149,7 +153,7 @@ void CheckValue(Design& d, size_t begin, size_t end) {
 
 // Lists the modules of the "modules" object that opens at i; returns the
 // place after its end.
-size_t ScanModules(Design& d, const TopScan& s, size_t i, bool exact) {
+size_t ScanModules(Design& d, const TopScan& s, size_t i) {
     i = s.SkipSpace(i + 1);
     if (i < d.textLen && d.text[i] == '}') return i + 1;
     for (;;) {
@@ -162,7 +166,8 @@ size_t ScanModules(Design& d, const TopScan& s, size_t i, bool exact) {
         i = s.SkipSpace(keyEnd);
         if (i >= d.textLen || d.text[i] != ':') FailWhole(d, "malformed JSON");
         i = s.SkipSpace(i + 1);
-        size_t end = exact || d.text[i] != '{' ? TopScan::npos : s.GuessObjectEnd(keyBegin, i);
+        size_t end =
+            d.exactSplit || d.text[i] != '{' ? TopScan::npos : s.GuessObjectEnd(keyBegin, i);
         if (end == TopScan::npos) end = s.ValueEnd(i);
         if (end == TopScan::npos) FailWhole(d, "malformed JSON");
         m.textBegin = i;
@@ -176,7 +181,6 @@ size_t ScanModules(Design& d, const TopScan& s, size_t i, bool exact) {
             continue;
         }
         if (i < d.textLen && d.text[i] == '}') return i + 1;
-        if (!exact) throw GuessFailed{};
         FailWhole(d, "malformed JSON");
     }
 }
@@ -191,7 +195,7 @@ void ParseWhole(Design& d) {
     if (err) FailParse(d, err);
 }
 
-void SplitModules(Design& d, bool exact) {
+void SplitModules(Design& d) {
     TopScan s(d.text, d.textLen);
     size_t i = s.SkipSpace(0);
     if (i >= d.textLen || d.text[i] != '{') FailWhole(d, "expected a JSON object at the top level");
@@ -212,7 +216,7 @@ void SplitModules(Design& d, bool exact) {
             // key finds it; the rest of the top level is only checked.
             size_t end;
             if (isModules && !found && d.text[i] == '{') {
-                end = ScanModules(d, s, i, exact);
+                end = ScanModules(d, s, i);
                 scanned = true;
             } else {
                 end = s.ValueEnd(i);
@@ -248,7 +252,6 @@ void OpenModule(Design& d, Module& m) {
                                           m.textEnd - m.textBegin, false)
                                    .get(e);
     if (err == simdjson::MEMALLOC) throw std::bad_alloc();
-    if (err && !d.exactSplit) throw GuessFailed{};
     if (err) FailWhole(d, "malformed JSON");
     if (e.get_object().get(m.json))
         Fail("module '" + std::string(m.name) + "': expected an object");
