@@ -1,4 +1,4 @@
-#!/ usr / bin / env python3
+#!/usr/bin/env python3
 """Writes the timing file (SDF 3.0, laid out as nextpnr writes one) of the
 design gen_design.py N writes, for the timing benchmark.
 
