@@ -16,7 +16,7 @@ if [ -z "$(ls -A "$seeds")" ]; then
     cp "$src"/examples/*/*.json "$src"/tests/data/*/*.json "$seeds"/ 2>/dev/null || true
     cp "$src"/tests/fuzz/seeds/*.json "$seeds"/ 2>/dev/null || true
     if command -v yosys >/dev/null; then
-        for v in "$src"/tests/tools/designs/*.v; do
+        for v in "$src"/tests/data/designs/*.v; do
             top=$(basename "$v" .v)
             "$src/flow/rtl2json" "$top" "$seeds/$top.json" "$v" >/dev/null 2>&1 || true
         done

@@ -1,0 +1,4 @@
+`include "defs.vh"
+module two(input a, output y);
+  leaf u(.a(a), .y(y));
+endmodule
