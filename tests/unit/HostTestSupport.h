@@ -8,6 +8,7 @@
 #include <unistd.h>
 
 #include <cstdio>
+#include <filesystem>
 #include <fstream>
 #include <sstream>
 #include <string>
@@ -25,7 +26,7 @@ using nlwtest::TempDir;
 using nlwtest::WriteFile;
 
 inline void MakeDirs(const std::string& path) {
-    std::system(("mkdir -p '" + path + "'").c_str());
+    std::filesystem::create_directories(path);
 }
 
 // Names in dir, one per line, sorted.
@@ -38,33 +39,7 @@ inline std::string ListDir(const std::string& dir) {
     return out;
 }
 
-// Sets (or, with null, unsets) an environment variable for a scope and
-// makes the installation roots be read again on both ends.
-class EnvSetting {
-public:
-    EnvSetting(const char* name, const char* value) : name_(name) {
-        if (const char* old = ::getenv(name)) {
-            had_ = true;
-            old_ = old;
-        }
-        if (value)
-            ::setenv(name, value, 1);
-        else
-            ::unsetenv(name);
-        Port::VornixPath::Reset();
-    }
-    ~EnvSetting() {
-        if (had_)
-            ::setenv(name_.c_str(), old_.c_str(), 1);
-        else
-            ::unsetenv(name_.c_str());
-        Port::VornixPath::Reset();
-    }
-
-private:
-    std::string name_, old_;
-    bool had_ = false;
-};
+using EnvSetting = nlwtest::ScopedEnv;
 
 // Keeps expected messages off the terminal while capturing them.
 class QuietCapture : public Port_MsgCapture {

@@ -13,6 +13,8 @@
 #include <string>
 #include <vector>
 
+#include "port/Port.h"
+
 namespace nlwtest {
 
 // A fresh directory below /tmp, removed with everything in it when the
@@ -29,10 +31,45 @@ public:
     TempDir(const TempDir&) = delete;
     TempDir& operator=(const TempDir&) = delete;
     const std::string& path() const { return path_; }
+    const std::string& Path() const { return path_; }
     std::string operator/(const std::string& name) const { return path_ + "/" + name; }
+    // Writes a file below the directory, creating its parents.
+    std::string File(const std::string& rel, const std::string& content) const {
+        std::filesystem::create_directories(std::filesystem::path(*this / rel).parent_path());
+        std::ofstream(*this / rel, std::ios::binary) << content;
+        return *this / rel;
+    }
+    std::string Dir(const std::string& rel) const {
+        std::filesystem::create_directories(*this / rel);
+        return *this / rel;
+    }
 
 private:
     std::string path_;
+};
+
+// Sets (or, with null, unsets) an environment variable while it lives; the
+// installation roots are read again on both ends.
+class ScopedEnv {
+public:
+    ScopedEnv(const char* name, const char* value) : name_(name) {
+        if (const char* old = ::getenv(name)) had_ = true, old_ = old;
+        Set(value);
+    }
+    ~ScopedEnv() { Set(had_ ? old_.c_str() : nullptr); }
+    ScopedEnv(const ScopedEnv&) = delete;
+    ScopedEnv& operator=(const ScopedEnv&) = delete;
+    void Set(const char* value) {
+        if (value)
+            ::setenv(name_.c_str(), value, 1);
+        else
+            ::unsetenv(name_.c_str());
+        Port::VornixPath::Reset();
+    }
+
+private:
+    std::string name_, old_;
+    bool had_ = false;
 };
 
 inline void WriteFile(const std::string& path, const std::string& text) {

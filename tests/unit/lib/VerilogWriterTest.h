@@ -13,6 +13,7 @@
 
 #include "Nlw_Verilog.h"
 #include "Nlw_VerilogWriter.h"
+#include "TestFiles.h"
 #include "framework/Nlw_Params.h"
 #include "framework/Nlw_Util.h"
 #include "model/Nlw_NlBuilder.h"
@@ -20,67 +21,8 @@
 
 namespace vwtest {
 
-// Sets (or, with null, unsets) an environment variable while it lives.
-class ScopedEnv {
-public:
-    ScopedEnv(const char* name, const char* value) : name_(name) {
-        if (const char* old = getenv(name)) {
-            had_ = true;
-            old_ = old;
-        }
-        Set(value);
-    }
-    ~ScopedEnv() { Set(had_ ? old_.c_str() : nullptr); }
-    ScopedEnv(const ScopedEnv&) = delete;
-    ScopedEnv& operator=(const ScopedEnv&) = delete;
-
-    void Set(const char* value) {
-        if (value)
-            setenv(name_.c_str(), value, 1);
-        else
-            unsetenv(name_.c_str());
-        if (name_ == "VORNIX") Port::VornixPath::Reset();
-    }
-
-private:
-    std::string name_;
-    std::string old_;
-    bool had_ = false;
-};
-
-// A directory below the system's temporary directory, removed with its
-// contents at the end.
-class TempDir {
-public:
-    TempDir() {
-        std::string pattern =
-            (std::filesystem::temp_directory_path() / "nlw_vwtest_XXXXXX").string();
-        path_ = mkdtemp(pattern.data()) ? pattern : std::string();
-    }
-    ~TempDir() {
-        std::error_code ec;
-        std::filesystem::remove_all(path_, ec);
-    }
-    TempDir(const TempDir&) = delete;
-    TempDir& operator=(const TempDir&) = delete;
-
-    const std::string& Path() const { return path_; }
-    // Writes a file below the directory, creating its parents.
-    std::string File(const std::string& rel, const std::string& content) const {
-        std::filesystem::path p = std::filesystem::path(path_) / rel;
-        std::filesystem::create_directories(p.parent_path());
-        std::ofstream(p, std::ios::binary) << content;
-        return p.string();
-    }
-    std::string Dir(const std::string& rel) const {
-        std::filesystem::path p = std::filesystem::path(path_) / rel;
-        std::filesystem::create_directories(p);
-        return p.string();
-    }
-
-private:
-    std::string path_;
-};
+using nlwtest::ScopedEnv;
+using nlwtest::TempDir;
 
 // Everything a writer needs, with an empty installation root: no device
 // data, no property filter, no library sources.

@@ -36,29 +36,15 @@ using DataFiles = std::vector<DataFile>;
 class Installation {
 public:
     explicit Installation(const DataFiles& files = {}) {
-        std::system(("mkdir -p '" + dir_.path() + "/data'").c_str());
-        for (const DataFile& f : files) WriteFile(dir_.path() + "/data/" + f.name, f.text);
-        const char* old = std::getenv("VORNIX");
-        hadOld_ = old != nullptr;
-        if (old) old_ = old;
-        ::setenv("VORNIX", dir_.path().c_str(), 1);
-        Port::VornixPath::Reset();
-    }
-    Installation(const Installation&) = delete;
-    Installation& operator=(const Installation&) = delete;
-    ~Installation() {
-        if (hadOld_)
-            ::setenv("VORNIX", old_.c_str(), 1);
-        else
-            ::unsetenv("VORNIX");
-        Port::VornixPath::Reset();
+        for (const DataFile& f : files) dir_.File("data/" + f.name, f.text);
+        dir_.Dir("data");
+        vornix_.Set(dir_.path().c_str());
     }
     const std::string& path() const { return dir_.path(); }
 
 private:
     TempDir dir_;
-    std::string old_;
-    bool hadOld_ = false;
+    nlwtest::ScopedEnv vornix_{"VORNIX", nullptr};
 };
 
 // A small library of cells the tests know by heart.
