@@ -1,16 +1,12 @@
 #!/usr/bin/env bash
-# The programs' exit codes, help texts, default file names and failure
-# handling, seen from the command line.
+# The programs' exit codes, default file names and failure handling, seen
+# from the command line (each option's effect: test_options.sh).
 source "$(dirname "$0")/lib.sh"
 yosys -q -p "read_verilog $data/programs/top.v; synth -top top; write_json top.json"
 q=$bin/qdb2ver
 
-check "qdb2ver -h prints the option lines" run 0 "$q" -h
-check "... -aka" has out.txt "-aka                Write Also-Know-As names as comments."
 check "tessel -h prints the overview" run 0 "$bin/tessel" -h
 check "... Valid netlist_types" has out.txt "Valid netlist_types are:"
-check "tessel -h sim prints the options" run 0 "$bin/tessel" -h sim
-check "... -ism" has out.txt "-ism                Include timcell modules in verilog file."
 check "no input file: usage, exit 2" run 2 "$q"
 check "usage names the synopsis" has out.txt "qdb2ver [-10ps] [-aka]"
 check "unknown option: exit 2" run 2 "$q" -nonsense top.json
@@ -38,7 +34,6 @@ done
 cp top.v first.v
 "$q" -w top.json > /dev/null 2>&1
 check "the same design gives the same bytes" cmp top.v first.v
-check "-tm renames the top module" eval "'$q' -w -tm chip top.json chip.v && grep -q 'module chip' chip.v"
 
 # The pin map: pad cells on the top-level ports, their package pins from the
 # cell's PINNAME or LOC or from the LOC of the port's net. Without pad

@@ -11,28 +11,8 @@ Nlw_CommandLine Parse(Nlw_Program p, std::vector<std::string> args) {
     return Nlw_ParseCommandLine(p, args);
 }
 
-TEST(CommandLine, Qdb2verSwitchesReachTheParameters) {
-    Nlw_CommandLine cl =
-        Parse(Nlw_Program::Qdb2ver, {"-10ps", "-aka", "-cd", "-fn", "-ism", "-ne", "-pf", "-tf",
-                                     "-ul", "-w", "-shm", "in.json"});
-    ASSERT_EQ(cl.error, "");
-    const Nlw_Params& p = cl.params;
-    EXPECT_FALSE(p.GetWritePsTimePrecision());
-    EXPECT_TRUE(p.GetWriteAka());
-    EXPECT_TRUE(p.GetWriteCellDefine());
-    EXPECT_TRUE(p.GetFlatten());
-    EXPECT_TRUE(p.GetWriteInstantiatedTimcells());
-    EXPECT_FALSE(p.GetWriteEscapedNames());
-    EXPECT_TRUE(p.GetWritePinFile());
-    EXPECT_TRUE(p.GetWriteTestFile());
-    EXPECT_TRUE(p.GetWriteUseLib());
-    EXPECT_TRUE(p.GetWriteShm());
-    EXPECT_EQ(p.GetOutputFileMode(), Port::Stream::Replace);
-    EXPECT_STREQ(p.GetInputFileName(), "in.json");
-    EXPECT_STREQ(p.GetInputFileType(), "json");
-    EXPECT_STREQ(p.GetOutputFileName(), "in.v");
-}
-
+// Each switch's effect on the written files is checked end to end
+// (tests/data/options/rows.txt); here the defaults, values and refusals.
 TEST(CommandLine, DefaultsWithoutOptions) {
     Nlw_CommandLine cl = Parse(Nlw_Program::Qdb2ver, {"dir.x/design.qda"});
     ASSERT_EQ(cl.error, "");
@@ -71,23 +51,6 @@ TEST(CommandLine, ValuesAndOptionalValues) {
     ASSERT_EQ(bare.error, "");
     EXPECT_EQ(bare.params.GetSdfPath(), nullptr);
     EXPECT_STREQ(bare.params.GetInputFileName(), "a.json");
-}
-
-TEST(CommandLine, TesselModesAndFiles) {
-    Nlw_CommandLine cl = Parse(Nlw_Program::Tessel, {"-sta", "-mhf", "-tb", "-vcd", "-ofmt",
-                                                     "verilog", "-intstyle", "silent", "a.json"});
-    ASSERT_EQ(cl.error, "");
-    EXPECT_TRUE(cl.params.GetStaMode());
-    EXPECT_FALSE(cl.params.GetSimMode());
-    EXPECT_TRUE(cl.params.GetMHFMode());
-    EXPECT_TRUE(cl.params.GetWriteTestFile());
-    EXPECT_TRUE(cl.params.GetWriteVcd());
-    EXPECT_TRUE(cl.quiet);
-    Nlw_CommandLine ecn = Parse(Nlw_Program::Tessel, {"-ecn", "formality", "-qdm", "d.qdm", "a"});
-    ASSERT_EQ(ecn.error, "");
-    EXPECT_TRUE(ecn.params.GetEcnMode());
-    EXPECT_STREQ(ecn.params.GetEcnTool(), "formality");
-    EXPECT_STREQ(ecn.params.GetQdmFileName(), "d.qdm");
 }
 
 TEST(CommandLine, TesselHostOptions) {
