@@ -92,15 +92,20 @@ else
     echo "skipped a full file system: no tmpfs can be mounted here"
 fi
 
-# SIGTERM while the netlist is written: no temporary left, old file kept.
+# Interrupted, terminated or hung up while the netlist is written: ended by
+# the signal, no temporary left, old file kept. (A background job of a
+# script starts with SIGINT ignored, which a run keeps; env gives the
+# signals back their default.)
 mkdir killed
 "$bin/qdb2ver" top.json killed/top.v >/dev/null 2>&1 && cp killed/top.v killed.keep
-"$bin/qdb2ver" -w -fn big.json killed/top.v >/dev/null 2>&1 & pid=$!
-for _ in $(seq 3000); do [ "$(temps killed)" != 0 ] && break; sleep 0.01; done
-seen=$(temps killed)
-kill -TERM $pid; wait $pid; rc=$?
-cond "SIGTERM during a large write: ended by the signal, no temporary, old file kept" \
-    '[ "$seen" != 0 ] && [ $rc = 143 ] && [ "$(temps killed)" = 0 ] && cmp -s killed/top.v killed.keep'
+for sig in INT:130 TERM:143 HUP:129; do
+    env --default-signal "$bin/qdb2ver" -w -fn big.json killed/top.v >/dev/null 2>&1 & pid=$!
+    for _ in $(seq 3000); do [ "$(temps killed)" != 0 ] && break; sleep 0.01; done
+    seen=$(temps killed)
+    kill -${sig%:*} $pid; wait $pid; rc=$?
+    cond "SIG${sig%:*} during a large write: exit $rc, no temporary, old file kept" \
+        '[ "$seen" != 0 ] && [ $rc = ${sig#*:} ] && [ "$(temps killed)" = 0 ] && cmp -s killed/top.v killed.keep'
+done
 
 # Inputs that change while read or never end: an error, exit 2, no crash.
 { cat top.json; head -c 48000000 /dev/zero | tr '\0' ' '; } > long.json

@@ -31,6 +31,11 @@ TEST_F(JsonReaderHierarchy, FlattensIntoLeavesOfTheTopNamedByPath) {
     Loaded l = LoadText(kHierJson, opt);
     ASSERT_TRUE(l.ok) << l.errors[0];
     nlwtest::ExpectGolden("reader/hierarchy_flattened", Text(l));
+    // Nets joined through a module that passes its input straight out take
+    // the port's name, whichever of the top's nets comes first.
+    l = LoadText(nlwtest::Data("json/feedthrough.json"), opt);
+    ASSERT_TRUE(l.ok) << l.errors[0];
+    nlwtest::ExpectGolden("reader/feedthrough_flattened", Text(l));
 }
 
 TEST_F(JsonReaderHierarchy, ChoosesTheTopModule) {
