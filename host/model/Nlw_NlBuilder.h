@@ -93,17 +93,24 @@ struct Nlw_NlArena {
     const char* Copy(const char* text, size_t len);
     size_t GetBytes() const { return bytes_; }
 
-private:
     // Chunks are huge-page sized and aligned, and the kernel is asked to back
     // them with huge pages: a large design touches hundreds of megabytes of
     // fresh memory, and the page faults would otherwise cost about as much
     // as building the model.
     static constexpr size_t kChunk = size_t(2) << 20;
-    struct FreeChunk {
-        void operator()(char* p) const;
-    };
-    static char* NewChunk(size_t size);
-    std::vector<std::unique_ptr<char, FreeChunk>> chunks_;
+
+    // Memory that a large user is done with (the design reader's copy of the
+    // file, read just before the model is built) can be handed to the
+    // arenas: new chunks are cut from it first. Its pages are touched
+    // already, so the model costs no page faults for them, and the process
+    // does not hold both. The region lives while any chunk cut from it
+    // does. DropDonations forgets what is left uncut.
+    static void Donate(std::shared_ptr<char> region, size_t size);
+    static void DropDonations();
+
+private:
+    static std::shared_ptr<char> NewChunk(size_t size);
+    std::vector<std::shared_ptr<char>> chunks_;
     char* cur_ = nullptr;
     size_t left_ = 0;
     size_t bytes_ = 0;

@@ -3,22 +3,67 @@
 
 #include <cstdlib>
 #include <cstring>
+#include <memory>
+#include <mutex>
 #include <new>
+#include <vector>
 
 #include "model/Nlw_NlBuilder.h"
 
-void Nlw_NlArena::FreeChunk::operator()(char* p) const {
-    std::free(p);
+namespace {
+
+// What is left of the regions handed over, cut in whole chunks.
+struct Donation {
+    std::shared_ptr<char> owner;
+    char* next;
+    size_t left;
+};
+std::mutex donationsMutex;
+std::vector<Donation>& Donations() {
+    static std::vector<Donation> list;
+    return list;
 }
 
-char* Nlw_NlArena::NewChunk(size_t size) {
+}  // namespace
+
+void Nlw_NlArena::Donate(std::shared_ptr<char> region, size_t size) {
+    if (!region) return;
+    const uintptr_t at = reinterpret_cast<uintptr_t>(region.get());
+    const size_t pad = (kChunk - at % kChunk) % kChunk;
+    if (size < pad + kChunk) return;
+    const size_t usable = (size - pad) / kChunk * kChunk;
+    std::lock_guard<std::mutex> lock(donationsMutex);
+    Donations().push_back(Donation{std::move(region), nullptr, usable});
+    Donations().back().next = Donations().back().owner.get() + pad;
+}
+
+void Nlw_NlArena::DropDonations() {
+    std::lock_guard<std::mutex> lock(donationsMutex);
+    Donations().clear();
+}
+
+std::shared_ptr<char> Nlw_NlArena::NewChunk(size_t size) {
     const size_t rounded = (size + kChunk - 1) / kChunk * kChunk;
+    {
+        std::lock_guard<std::mutex> lock(donationsMutex);
+        std::vector<Donation>& list = Donations();
+        for (size_t i = 0; i < list.size(); ++i) {
+            Donation& d = list[i];
+            if (d.left < rounded) continue;
+            char* p = d.next;
+            d.next += rounded;
+            d.left -= rounded;
+            std::shared_ptr<char> chunk(d.owner, p);  // keeps the region alive
+            if (d.left < kChunk) list.erase(list.begin() + static_cast<std::ptrdiff_t>(i));
+            return chunk;
+        }
+    }
     void* p = std::aligned_alloc(kChunk, rounded);
     if (p == nullptr) throw std::bad_alloc();
 #ifdef MADV_HUGEPAGE
     ::madvise(p, rounded, MADV_HUGEPAGE);  // advice only: failure changes nothing
 #endif
-    return static_cast<char*>(p);
+    return std::shared_ptr<char>(static_cast<char*>(p), [](char* c) { std::free(c); });
 }
 
 void* Nlw_NlArena::Allocate(size_t size, size_t align) {

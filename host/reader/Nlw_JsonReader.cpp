@@ -11,6 +11,7 @@
 #include <cerrno>
 #include <cstdio>
 #include <cstring>
+#include <memory>
 #include <new>
 
 #include "port/Port.h"
@@ -76,6 +77,10 @@ namespace {
 // while it is parsed ends the process with SIGBUS, a read one gives an
 // error. Only a regular file is read, so that its size is known before and
 // checked after: /dev/zero or a fifo cannot make the load grow without end.
+//
+// A large text is allocated in whole model chunks, so that once it is read
+// it can be handed to the model (see Nlw_NlArena::Donate): the model is
+// built in the pages the text has touched already.
 class Input {
 public:
     bool ReadFile(const char* fileName, std::string& reason) {
@@ -89,13 +94,34 @@ public:
         return ok;
     }
 
-    void Copy(const std::string& text) { copy_ = simdjson::padded_string(text); }
+    void Copy(const std::string& text) {
+        Allocate(text.size());
+        if (!text.empty()) std::memcpy(region_.get(), text.data(), text.size());
+    }
 
-    const char* data() const { return copy_.data(); }
-    size_t size() const { return copy_.size(); }
-    void Release() { copy_ = simdjson::padded_string(); }
+    const char* data() const { return region_.get(); }
+    size_t size() const { return size_; }
+    // Lets the text go: to the model's arenas when it is large enough to
+    // serve them.
+    void Release() {
+        if (capacity_ >= kDonateFrom) Nlw_NlArena::Donate(std::move(region_), capacity_);
+        region_.reset();
+    }
 
 private:
+    static constexpr size_t kDonateFrom = 8 * Nlw_NlArena::kChunk;
+
+    void Allocate(size_t size) {
+        const size_t align = size >= kDonateFrom ? Nlw_NlArena::kChunk : 64;
+        const size_t capacity = (size + simdjson::SIMDJSON_PADDING + align - 1) / align * align;
+        char* p = static_cast<char*>(std::aligned_alloc(align, capacity));
+        if (p == nullptr) throw std::bad_alloc();
+        std::memset(p + size, 0, capacity - size);
+        region_ = std::shared_ptr<char>(p, [](char* c) { std::free(c); });
+        size_ = size;
+        capacity_ = capacity;
+    }
+
     bool Read(int fd, std::string& reason) {
         struct stat before, after;
         if (::fstat(fd, &before) != 0) {
@@ -111,11 +137,10 @@ private:
             return false;
         }
         const size_t size = static_cast<size_t>(before.st_size);
-        copy_ = simdjson::padded_string(size);
-        if (size > 0 && copy_.data() == nullptr) throw std::bad_alloc();
+        Allocate(size);
         size_t done = 0;
         while (done < size) {
-            ssize_t n = ::pread(fd, copy_.data() + done, size - done, static_cast<off_t>(done));
+            ssize_t n = ::pread(fd, region_.get() + done, size - done, static_cast<off_t>(done));
             if (n < 0 && errno == EINTR) continue;
             if (n < 0) {
                 reason = std::strerror(errno);
@@ -133,7 +158,9 @@ private:
         return true;
     }
 
-    simdjson::padded_string copy_;
+    std::shared_ptr<char> region_;
+    size_t size_ = 0;
+    size_t capacity_ = 0;
 };
 
 // "line L, column C" of a byte offset, for the reader of the message.
@@ -185,12 +212,15 @@ bool Run(Design& d, Input& text, Nlw_NlView& view, std::unique_ptr<Nlw_Design>& 
             BuildFlat(d, view);
         else
             BuildUnfolded(d, view);
+        Nlw_NlArena::DropDonations();
         ConnectOpenOutputs(view);
         design = std::make_unique<Nlw_Design>(d.modules[d.top].nameText);
         return true;
     } catch (const ReadError& e) {
+        Nlw_NlArena::DropDonations();
         NLW_MSG().issueError("%s: %s\n", d.File(), e.text.c_str());
     } catch (const std::bad_alloc&) {
+        Nlw_NlArena::DropDonations();
         NLW_MSG().issueError(
             "%s: out of memory: the design does not fit in the memory of this "
             "machine\n",
