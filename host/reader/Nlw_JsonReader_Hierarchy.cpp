@@ -114,8 +114,14 @@ void ResolveHierarchy(Design& d) {
 
     LoadCellLibrary(d);
     // Types are met in file order of modules and cells.
-    for (Module& m : d.modules)
-        if (m.reachable) DigestModule(d, m);
+    std::vector<uint32_t> reached;
+    for (uint32_t i = 0; i < d.modules.size(); ++i)
+        if (d.modules[i].reachable) reached.push_back(i);
+    ParseAhead ahead(d, reached);
+    for (size_t k = 0; k < reached.size(); ++k) {
+        ahead.Open(k);
+        DigestModule(d, d.modules[reached[k]]);
+    }
     for (uint32_t mi : d.bottomUp) {
         Module& m = d.modules[mi];
         m.padsBelow = m.ownPads;

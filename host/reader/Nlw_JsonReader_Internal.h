@@ -9,11 +9,14 @@
 
 #include <simdjson.h>
 
+#include <condition_variable>
 #include <cstdint>
 #include <map>
 #include <memory>
+#include <mutex>
 #include <string>
 #include <string_view>
+#include <thread>
 #include <unordered_map>
 #include <vector>
 
@@ -306,6 +309,44 @@ struct Design {
 struct GuessFailed {};
 void SplitModules(Design& d);
 void OpenModule(Design& d, Module& m);
+// The fault of a module's text: while the places are judged by the layout,
+// GuessFailed; else the message a parse of the whole text gives.
+[[noreturn]] void OpenFailed(Design& d);
+
+// Parses the modules of a list in a thread of its own, one module ahead of
+// the one being read (Nlw_JsonReader_ParseAhead.cpp).
+class ParseAhead {
+public:
+    // order: the modules to be opened, in the order they will be.
+    ParseAhead(Design& d, const std::vector<uint32_t>& order);
+    ~ParseAhead();
+    ParseAhead(const ParseAhead&) = delete;
+    ParseAhead& operator=(const ParseAhead&) = delete;
+    // Opens the k-th module of the order into its json, valid until the
+    // next is opened; the modules before it are let go.
+    void Open(size_t k);
+
+private:
+    struct Slot {
+        simdjson::dom::parser parser;
+        simdjson::dom::element root;
+        simdjson::error_code error = simdjson::SUCCESS;
+    };
+    void Run();
+    void Parse(size_t k);
+
+    Design& d_;
+    std::vector<uint32_t> order_;
+    std::vector<std::pair<size_t, size_t>> ranges_;  // of the text, per module of the order
+    Slot slots_[2];
+    size_t parsed_ = 0;    // modules of the order parsed
+    size_t released_ = 0;  // modules of the order done with
+    bool stop_ = false;
+    std::mutex mutex_;
+    std::condition_variable changed_;
+    std::thread thread_;
+};
+
 // Parses the whole text; a fault ends the load with its message.
 void ParseWhole(Design& d);
 [[noreturn]] void FailParse(const Design& d, simdjson::error_code err);
@@ -313,7 +354,7 @@ void ParseWhole(Design& d);
 // Reading the document (Nlw_JsonReader_Modules.cpp, Nlw_JsonReader_Cells.cpp).
 // The module list with every module's attributes, ports and children.
 void ReadModuleList(Design& d);
-// Named nets and cells of a module reached from the top.
+// Named nets and cells of a module reached from the top, opened already.
 void DigestModule(Design& d, Module& m);
 void ReadCells(Design& d, Module& m, simdjson::dom::object cells);
 // Appends the bits of a bit array to m.refs (raw bit numbers, to be mapped

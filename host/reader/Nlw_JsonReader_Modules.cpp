@@ -401,9 +401,12 @@ void ReadModuleListOnce(Design& d) {
     // module has been parsed, so that a fault of the text comes first.
     std::vector<uint32_t> stamp(d.modules.size(), 0);
     std::unique_ptr<ReadError> first;
+    std::vector<uint32_t> all(d.modules.size());
+    for (uint32_t i = 0; i < all.size(); ++i) all[i] = i;
+    ParseAhead ahead(d, all);
     for (uint32_t i = 0; i < d.modules.size(); ++i) {
         Module& m = d.modules[i];
-        OpenModule(d, m);
+        ahead.Open(i);
         if (first) continue;
         try {
             ReadModuleAttrs(m, d.pool);
@@ -433,7 +436,6 @@ void ReadModuleList(Design& d) {
 }
 
 void DigestModule(Design& d, Module& m) {
-    OpenModule(d, m);
     Where where{m.name, {}, "net", {}};
     std::vector<NetEntry>& entries = d.scratch.entries;
     entries.clear();

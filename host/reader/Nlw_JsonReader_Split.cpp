@@ -245,6 +245,10 @@ void SplitModules(Design& d) {
     }
 }
 
+void OpenFailed(Design& d) {
+    FailWhole(d, "malformed JSON");
+}
+
 void OpenModule(Design& d, Module& m) {
     simdjson::dom::element e;
     simdjson::error_code err = d.parser
