@@ -49,8 +49,8 @@ inline std::string ModelText(const Nlw_NlView& view) {
         for (const Nlw_NlPin& p : m->GetPins()) out += PinText(p);
         if (const auto* buses = m->GetPinBuses())
             for (const Nlw_NlPinBus* b : *buses)
-                out += vorform("  portbus %s[%d:%d]\n", b->GetWritableName(), b->GetMSB(0),
-                               b->GetLSB(0));
+                out += vorform("  portbus %s[%d:%d]%s\n", b->GetWritableName(), b->GetMSB(0),
+                               b->GetLSB(0), NameAndAka("", b->GetAka()).c_str());
         for (const Nlw_NlSignal* s : m->GetSignals()) {
             out += "  net " + NameAndAka(s->GetWritableName(), s->GetAka());
             if (!s->IsVisible()) out += " hidden";
@@ -83,6 +83,15 @@ inline std::string ModelText(const Nlw_NlView& view) {
     if (view.GetPartName())
         out += std::string("part ") + view.GetPartName() + " device " +
                (view.GetDeviceInfo() ? view.GetDeviceInfo() : "-") + "\n";
+    return out;
+}
+
+// The view's types in stored order, with their akas.
+inline std::string TypesText(const Nlw_NlView& view) {
+    std::string out;
+    for (const Nlw_NlType* t : view.GetTypes())
+        out += std::string(t->IsModule() ? "module " : "library ") +
+               NameAndAka(t->GetName(), t->GetAka()) + "\n";
     return out;
 }
 

@@ -5,6 +5,8 @@
 #include <type_traits>
 #include <vector>
 
+#include "ModelText.h"
+#include "TestFiles.h"
 #include "framework/Nlw_Nl_LU.h"
 #include "model/Nlw_NlBuilder.h"
 
@@ -104,36 +106,21 @@ TEST_F(Legalizer, LegalizesEveryKindOfNameAndKeepsTheOldOnesAsAka) {
     Nlw_NlType* sub = b.AddModuleType("my-sub");
     Nlw_NlType* odd = b.AddLibraryType("lib-cell", false, false);
     b.AddTypePin(odd, "p-in", NLW_DIR_INPUT);
-    Nlw_NlBlock* leaf = b.CreateLeaf(top, odd, "u-1");
+    b.CreateLeaf(top, odd, "u-1");
     Nlw_NlBlock* s1 = b.CreateMacro(top, sub, "s-1");
     Nlw_NlPin* port = b.AddPort(top, "in-a", NLW_DIR_INPUT);
-    Nlw_NlPinBus* portBus = b.AddPortBus(top, "d-x", NLW_DIR_OUTPUT, 1, 0);
-    Nlw_NlSignal* net = b.AddSignal(top, "n-1");
+    b.AddPortBus(top, "d-x", NLW_DIR_OUTPUT, 1, 0);
+    b.AddSignal(top, "n-1");
     Nlw_NlBus* bus = b.AddSignalBus(top, "b-s", 1, 0);
     b.GetSignalBusMember(bus, 0);
     s1->SetAka("given");
 
     Run(true);
-
-    EXPECT_STREQ(sub->GetName(), "my_sub");
-    EXPECT_STREQ(sub->GetAka(), "my-sub");
-    EXPECT_STREQ(odd->GetName(), "lib-cell");
-    EXPECT_EQ(Instances(top), (Names{"u_1", "s_1"}));
-    EXPECT_EQ(Pins(top), (Names{"in_a", "d_x[1]", "d_x[0]"}));
-    EXPECT_STREQ(portBus->GetWritableName(), "d_x");
-    EXPECT_EQ(Signals(top), (Names{"n_1", "b_s[0]"}));
-    EXPECT_EQ(SignalBuses(top), (Names{"b_s"}));
-    EXPECT_STREQ(leaf->GetPin(0)->GetWritableName(), "p-in");  // cell pins stay
-    EXPECT_STREQ(leaf->GetAka(), "u-1");
-    EXPECT_STREQ(s1->GetAka(), "given");  // an existing aka is kept
-    EXPECT_STREQ(port->GetAka(), "in-a");
-    EXPECT_STREQ(portBus->GetAka(), "d-x");
-    EXPECT_STREQ(top->GetPin(2)->GetAka(), "d-x[0]");
-    EXPECT_STREQ(net->GetAka(), "n-1");
-    EXPECT_STREQ(bus->GetAka(), "b-s");
+    // Cell pins stay; an existing aka is kept; unchanged names get none.
+    nlwtest::ExpectGolden("legalizer/every_kind",
+                          nlwtest::TypesText(view) + nlwtest::ModelText(view));
     EXPECT_EQ(top->GetPinByAlias("d_x[0]"), top->GetPin(2));
     EXPECT_EQ(top->FindPin("in_a"), port);
-    EXPECT_EQ(top->GetAka(), nullptr);  // unchanged names get none
 }
 
 TEST_F(Legalizer, VisitsTypesThenEachMacrosNamesInWalkOrder) {
@@ -261,9 +248,7 @@ TEST_F(Legalizer, LetsAPortShareItsNameOnlyWithItsOwnInsideSignal) {
         b.ConnectChild(e->GetPinMember(i), b.GetSignalBusMember(eIn, i));
     }
     Run(true);
-    EXPECT_EQ(Pins(top), (Names{"a", "q", "d[1]", "d[0]", "e[1]", "e[0]"}));
-    EXPECT_EQ(Signals(top), (Names{"a", "n", "q_1", "d[1]", "e_1[1]", "d[0]", "e_1[0]"}));
-    EXPECT_EQ(SignalBuses(top), (Names{"d", "e_1"}));
+    nlwtest::ExpectGolden("legalizer/port_shares_inside_name", nlwtest::ModelText(view));
 }
 
 // Buses and scalars of one base name get apart names; instances yield to
@@ -280,28 +265,18 @@ TEST_F(Legalizer, KeepsNamesOfDifferentKindsApart) {
     b.AddSignalBus(top, "w", 1, 0);
     for (const char* name : {"u", "q", "w", "v"}) b.CreateLeaf(top, cell, name);
     Run(true);
-    EXPECT_EQ(Signals(top), (Names{"d", "d_1[1]", "d_1[0]", "u"}));
-    EXPECT_EQ(SignalBuses(top), (Names{"d_1", "w"}));
-    EXPECT_EQ(Pins(top), (Names{"p_1[1]", "p_1[0]", "p", "q"}));
-    EXPECT_STREQ((*top->GetPinBuses())[0]->GetWritableName(), "p_1");
+    nlwtest::ExpectGolden("legalizer/kinds_apart", nlwtest::ModelText(view));
     EXPECT_EQ(top->GetPinByAlias("p_1[0]"), top->GetPin(1));
-    EXPECT_EQ(Instances(top), (Names{"u_1", "q_1", "w_1", "v"}));
 }
 
 TEST_F(Legalizer, MakesModuleTypeNamesUniqueAndLeavesLibraryTypesAlone) {
-    Nlw_NlType* lib = b.AddLibraryType("lib-x", false, false);
-    Nlw_NlType* m1 = b.AddModuleType("my-t");
-    Nlw_NlType* m2 = b.AddModuleType("my_t");
+    b.AddLibraryType("lib-x", false, false);
+    b.AddModuleType("my-t");
+    b.AddModuleType("my_t");
     Nlw_NlType* m3 = b.AddModuleType("CELL");
-    Nlw_NlType* m4 = b.AddModuleType("lib_x");
+    b.AddModuleType("lib_x");
     Run(true);
-    EXPECT_STREQ(lib->GetName(), "lib-x");
-    EXPECT_STREQ(cell->GetName(), "CELL");
-    EXPECT_STREQ(m1->GetName(), "my_t");
-    EXPECT_STREQ(m2->GetName(), "my_t_1");
-    EXPECT_STREQ(m3->GetName(), "CELL_1");
-    EXPECT_STREQ(m4->GetName(), "lib_x");
-    EXPECT_STREQ(m3->GetAka(), "CELL");
+    nlwtest::ExpectGolden("legalizer/type_names", nlwtest::TypesText(view));
     EXPECT_EQ(view.FindType("CELL"), cell);
     EXPECT_EQ(view.FindType("CELL_1"), m3);
 }

@@ -34,13 +34,6 @@ public:
 const char* const kNoticeStart =
     "If Verilog simulation is performed outside the Atelier environment, please add the "
     "chipwide module to the simulation invocation command. ";
-const char* const kNoVornix =
-    " The VORNIX environment variable must be set for this program towork. Please check your "
-    "environment to ensure that it is setup properly to use the Vornix tools\n";
-const char* const kNoTimcells =
-    "Timcell library directory not found, the `uselib constructis omitted for the -ul "
-    "option.\n";
-
 class VerilogHeader : public vwtest::WriterTest {
 protected:
     VerilogHeader() { top = b_.CreateRoot(b_.AddModuleType("top"), "top"); }
@@ -68,32 +61,6 @@ TEST_F(VerilogHeader, WritesTheDisclaimerOfTheMode) {
     params_.SetEcnMode(true);
     params_.SetWritePsTimePrecision(false);
     nlwtest::ExpectGolden("header/equivalence", Header());
-}
-
-TEST_F(VerilogHeader, UselibNamesTheFirstRootHoldingTheTimcells) {
-    vwtest::TempDir tmp;
-    const std::string a = tmp.Dir("a/verilog/src"), b = tmp.Dir("b/verilog/src/timcells");
-    const std::string file = tmp.File("f", "x");
-    struct Case {
-        std::string roots;
-        std::string uselib;
-        std::vector<std::string> errors;
-    };
-    const Case cases[] = {
-        {file + ":" + tmp.Path() + "/a:" + tmp.Path() + "/b:" + tmp.Path() + "/missing",
-         "`uselib dir=" + b + " libext=.v\n",
-         {}},
-        {tmp.Path(), "", {kNoTimcells}},  // left out with an error
-        {"", "", {kNoVornix, kNoTimcells}},
-    };
-    const std::string plain = Header();
-    params_.SetWriteUseLib(true);
-    for (const Case& c : cases) {
-        vwtest::ScopedEnv vornix("VORNIX", c.roots.c_str());
-        Port_MsgCapture capture;
-        EXPECT_EQ(Header(), nlwtest::Replaced(plain, "ps\n", "ps\n" + c.uselib)) << c.roots;
-        EXPECT_EQ(capture.Texts(Port_MsgLevel::Error), c.errors) << c.roots;
-    }
 }
 
 TEST_F(VerilogHeader, ChipwideIsNeededForUndrivenGlobalsOrTheTopProperty) {

@@ -21,19 +21,7 @@ using readertest::TestCells;
 
 // top: port a, clk and y; LUT2 "$g" and module instance u1 of sub, which
 // holds LUT2 "l.x" and FD "r".
-const char* kDesign = R"({"modules": {
- "top": {"attributes": {"top": 1},
-  "ports": {"a": {"direction": "input", "bits": [2]}, "clk": {"direction": "input", "bits": [3]},
-            "y": {"direction": "output", "bits": [4]}},
-  "cells": {"$g": {"type": "LUT2", "connections": {"I0": [2], "I1": [2], "O": [5]}},
-            "u1": {"type": "sub", "connections": {"d": [5], "c": [3], "q": [4]}}},
-  "netnames": {}},
- "sub": {
-  "ports": {"d": {"direction": "input", "bits": [2]}, "c": {"direction": "input", "bits": [3]},
-            "q": {"direction": "output", "bits": [4]}},
-  "cells": {"l.x": {"type": "LUT2", "connections": {"I0": [2], "I1": [2], "O": [5]}},
-            "r": {"type": "FD", "connections": {"C": [3], "D": [5], "Q": [4]}}},
-  "netnames": {}}}})";
+const std::string kDesign = nlwtest::Data("json/sdf_design.json");
 
 const char* kHead = "(DELAYFILE (SDFVERSION \"3.0\") (DIVIDER /) (TIMESCALE 1ns)\n";
 
@@ -146,18 +134,7 @@ TEST(NominalTiming, GivesEveryCellItsLibraryArcsAndEveryNetAZeroDelay) {
     Installation inst(DataFiles{{"cells.dat", TestCells()}});
     Loaded design = LoadText(kDesign);
     Nlw_Liberty lib;
-    ASSERT_TRUE(lib.LoadText("t.lib", R"(library (t) { time_unit : "1ns";
-      cell (LUT2) { pin (O) { direction : output;
-        timing () { related_pin : "I0 I1"; cell_rise (scalar) { values ("0.25"); }
-                    cell_fall (scalar) { values ("0.2"); } } } }
-      cell (FD) { pin (Q) { direction : output;
-        timing () { related_pin : "C"; timing_type : rising_edge;
-                    cell_rise (scalar) { values ("0.3"); } cell_fall (scalar) { values ("0.3"); } } }
-        pin (D) { direction : input;
-        timing () { related_pin : "C"; timing_type : setup_rising;
-                    rise_constraint (scalar) { values ("0.1"); } }
-        timing () { related_pin : "C"; timing_type : hold_rising;
-                    rise_constraint (scalar) { values ("0.05"); } } } } })"));
+    ASSERT_TRUE(lib.LoadText("t.lib", nlwtest::Data("timing/nominal.lib")));
     Nlw_Timing timing;
     EXPECT_EQ(Nlw_NominalTiming::Make(lib, *design.view, timing), 3u);
     std::string kinds;
