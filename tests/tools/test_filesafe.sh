@@ -93,16 +93,23 @@ else
 fi
 
 # Interrupted, terminated or hung up while the netlist is written: ended by
-# the signal, no temporary left, old file kept. (A background job of a
-# script starts with SIGINT ignored, which a run keeps; env gives the
-# signals back their default.)
+# the signal, no temporary left, old file kept. The run is stopped while its
+# temporary exists, so that the signal meets it mid-write however fast it
+# is (a run that ended first is tried again). A background job of a script
+# starts with SIGINT ignored, which a run keeps; env gives the signals back
+# their default.
 mkdir killed
 "$bin/qdb2ver" top.json killed/top.v >/dev/null 2>&1 && cp killed/top.v killed.keep
 for sig in INT:130 TERM:143 HUP:129; do
-    env --default-signal "$bin/qdb2ver" -w -fn big.json killed/top.v >/dev/null 2>&1 & pid=$!
-    for _ in $(seq 3000); do [ "$(temps killed)" != 0 ] && break; sleep 0.01; done
-    seen=$(temps killed)
-    kill -${sig%:*} $pid; wait $pid; rc=$?
+    for _ in 1 2 3 4 5; do
+        cp killed.keep killed/top.v
+        env --default-signal "$bin/qdb2ver" -w -fn big.json killed/top.v >/dev/null 2>&1 & pid=$!
+        for _ in $(seq 3000); do [ "$(temps killed)" != 0 ] && break; sleep 0.01; done
+        kill -STOP $pid 2>/dev/null
+        seen=$(temps killed)
+        kill -${sig%:*} $pid 2>/dev/null; kill -CONT $pid 2>/dev/null; wait $pid; rc=$?
+        [ "$seen" != 0 ] && break
+    done
     cond "SIG${sig%:*} during a large write: exit $rc, no temporary, old file kept" \
         '[ "$seen" != 0 ] && [ $rc = ${sig#*:} ] && [ "$(temps killed)" = 0 ] && cmp -s killed/top.v killed.keep'
 done

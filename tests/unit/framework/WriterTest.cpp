@@ -321,6 +321,23 @@ TEST(WriterRun, PlacesAllFilesOrNone) {
     }
 }
 
+// A file of a run that cannot be placed for another reason than an
+// existing file (its folder moved away meanwhile) says that reason.
+TEST(WriterRun, PlacementFailureNamesItsReason) {
+    TempDir dir;
+    hosttest::MakeDirs(dir / "sub");
+    QuietCapture capture;
+    Nlw_FileRun run;
+    PlainWriter w(nullptr, (dir / "sub/top.v").c_str(), Port::Stream::Create);
+    w.WriteL("text");
+    EXPECT_TRUE(w.Close());
+    ASSERT_EQ(::rename((dir / "sub").c_str(), (dir / "moved").c_str()), 0);
+    EXPECT_FALSE(run.Commit());
+    EXPECT_EQ(capture.Texts(Port_MsgLevel::Error),
+              std::vector<std::string>{"Cannot write file '" + dir / "sub/top.v" +
+                                       "': No such file or directory\n"});
+}
+
 TEST(FileSafety, ModuleFileNamesAreSafeAndUniqueIgnoringCase) {
     const std::vector<std::string> names = {"top",   "../../escaped",      "a b/c", "esc$x ", "Top",
                                             "top",   "chipwide",           "-opt",  "CON",    "",
