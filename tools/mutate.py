@@ -6,9 +6,12 @@ sources (a flipped comparison, a constant changed by one, a dropped
 statement, two swapped arguments), and for each one rebuilds and runs the
 unit and end-to-end tests. A mutation is caught when any test fails (or the
 run times out); one that does not compile is counted apart. The sources are
-restored after every mutation, also when the run is interrupted.
+restored after every mutation, also when the run is interrupted. Each
+catch names the tests that failed; --only runs chosen sites of the sample
+again (a catch by an unrelated test may be a test that fails by chance).
 
     tools/mutate.py [--seed N] [--count N] [--build DIR] [--tests REGEX] [--list]
+                    [--only FILE:LINE,...]
 
 Run it in a worktree of its own: it edits the sources it mutates in place.
 The sample depends only on the seed and the source text, so two runs over
@@ -90,10 +93,15 @@ def sample(seed, count):
     return sites[:count * 2], len(sites)
 
 
-def run(cmd, cwd, timeout):
+def run(cmd, cwd, timeout, failed=None):
+    """The command's exit code, or "timeout"; the names of the tests ctest
+    reports failed are added to the list failed."""
     try:
         p = subprocess.run(cmd, cwd=cwd, stdout=subprocess.PIPE, stderr=subprocess.STDOUT,
                            timeout=timeout)
+        if failed is not None:
+            failed += re.findall(r"Test +#\d+: (\S+) \.*\**(?:Failed|Exception|Timeout)",
+                                 p.stdout.decode(errors="replace"))
         return p.returncode
     except subprocess.TimeoutExpired:
         return "timeout"
@@ -107,9 +115,14 @@ def main():
     ap.add_argument("--tests", default="", help="ctest -R regex (default: all tests)")
     ap.add_argument("--jobs", type=int, default=2)
     ap.add_argument("--list", action="store_true", help="print the sample and stop")
+    ap.add_argument("--only", default="",
+                    help="comma-separated FILE:LINE sites of the sample to run again")
     args = ap.parse_args()
 
     chosen, total = sample(args.seed, args.count)
+    if args.only:
+        only = set(args.only.split(","))
+        chosen = [c for c in chosen[:args.count] if "%s:%d" % (c[0], c[1] + 1) in only]
     if args.list:
         for path, i, kind, old, new in chosen[:args.count]:
             print("%s:%d %s\n  - %s\n  + %s" % (path, i + 1, kind, old.strip(), new.strip()))
@@ -140,6 +153,7 @@ def main():
         assert lines[i] == old, "%s changed since the sample was taken" % path
         lines[i] = new
         start = time.time()
+        kind_note = ""
         try:
             with open(full, "w", encoding="utf-8") as f:
                 f.write("\n".join(lines))
@@ -147,18 +161,23 @@ def main():
                 invalid += 1
                 verdict = "invalid"
             else:
-                result = run(ctest, args.build, 3600)
+                failed = []
+                result = run(ctest, args.build, 3600, failed)
                 if result == 0:
                     survived += 1
                     survivors.append("%s:%d %s: %s" % (path, i + 1, kind, new.strip() or "(dropped) " + old.strip()))
                     verdict = "SURVIVED"
                 else:
                     caught += 1
+                    # The test that failed: a catch by a test that has
+                    # nothing to do with the site is worth a second look.
                     verdict = "caught"
+                    kind_note = " by " + ", ".join(failed) if failed else " (%s)" % result
         finally:
             with open(full, "w", encoding="utf-8") as f:
                 f.write(original)
-        print("%-8s %s:%d %s (%.0f s)" % (verdict, path, i + 1, kind, time.time() - start), flush=True)
+        print("%-8s %s:%d %s (%.0f s)%s" % (verdict, path, i + 1, kind, time.time() - start,
+                                             kind_note), flush=True)
     run(["cmake", "--build", args.build, "-j%d" % args.jobs], ROOT, 3600)
     print("\nsites: %d, sampled: %d, not compilable: %d" % (total, caught + survived, invalid))
     for s in survivors:
