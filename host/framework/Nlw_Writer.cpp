@@ -243,6 +243,10 @@ void Nlw_Writer::Write(const char* text, int, int) {
     Append(text, std::strlen(text));
 }
 
+void Nlw_Writer::WriteText(const char* text, size_t len) {
+    Append(text, len);
+}
+
 Nlw_Params* Nlw_Writer::GetParams() const {
     return nlw_ ? nlw_->GetParams() : nullptr;
 }

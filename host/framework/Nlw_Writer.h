@@ -72,10 +72,11 @@ public:
     virtual unsigned char IsExternalProperty(Vdm_Property* property, Vdm_PropertyHolder* holder);
 
     // Output.
-    void WriteL(const char* text);           // text and line end
-    void WriteIL(const char* text);          // indentation, text, line end
-    void WriteI(const char* text);           // indentation and text
-    void Write(const char* text, int, int);  // text alone
+    void WriteL(const char* text);                 // text and line end
+    void WriteIL(const char* text);                // indentation, text, line end
+    void WriteI(const char* text);                 // indentation and text
+    void Write(const char* text, int, int);        // text alone
+    void WriteText(const char* text, size_t len);  // len characters of text
     void UpIndent() { ++indent_; }
     void DownIndent() {
         if (indent_ > 0) --indent_;

@@ -103,7 +103,7 @@ void Nlw_SdfWriter::WriteHead(Nlw_NlBlock* scope) {
 // large pieces: a timing file has several lines per cell, and a line at a
 // time costs more than the formatting.
 void Nlw_SdfWriter::Begin(int depth) {
-    text_.append(static_cast<size_t>(depth) * kIndentWidth, ' ');
+    text_.Append(static_cast<size_t>(depth) * kIndentWidth, ' ');
 }
 
 void Nlw_SdfWriter::Line(int depth, const char* text) {
@@ -114,7 +114,7 @@ void Nlw_SdfWriter::Line(int depth, const char* text) {
 
 void Nlw_SdfWriter::FlushText(bool always) {
     if (text_.empty() || (!always && text_.size() < kFlushSize)) return;
-    Write(text_.c_str(), 0, 0);
+    WriteText(text_.data(), text_.size());
     text_.clear();
 }
 
@@ -274,17 +274,16 @@ void Nlw_SdfWriter::AppendValues(const Nlw_TimingEntry& e) {
 // A value as a whole number of written units; SDF readers round to their
 // own precision, so writing the netlist's precision keeps both in step.
 void Nlw_SdfWriter::AppendNumber(double ps) {
-    char buf[24];
     const long long units = std::llround(ps / unit_);
-    char* end = std::to_chars(buf, buf + sizeof buf, units).ptr;
-    text_.append(buf, end);
+    char* at = text_.Reserve(24);
+    text_.Commit(static_cast<size_t>(std::to_chars(at, at + 24, units).ptr - at));
 }
 
 void Nlw_SdfWriter::AppendEscaped(const char* name) {
     const char* run = name;
     for (const char* p = name; *p; ++p) {
         if (IsPlain(*p)) continue;
-        text_.append(run, p);
+        text_.Append(run, static_cast<size_t>(p - run));
         text_ += '\\';
         run = p;
     }
@@ -300,7 +299,7 @@ void Nlw_SdfWriter::AppendInstancePath(const Nlw_NlBlock* block, const Nlw_NlBlo
         if (parent != pathOwner_ || scope != pathScope_) {
             pathOwner_ = parent;
             pathScope_ = scope;
-            std::string saved;
+            Nlw_TextBuffer saved;
             saved.swap(text_);
             const Nlw_NlBlock* chain[64];
             size_t n = 0;

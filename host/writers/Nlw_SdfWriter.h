@@ -6,6 +6,7 @@
 #include <unordered_map>
 #include <vector>
 
+#include "framework/Nlw_TextBuffer.h"
 #include "framework/Nlw_Timing.h"
 #include "framework/Nlw_Writer.h"
 
@@ -59,11 +60,11 @@ private:
     void MakeNetDelayIndex();
 
     Nlw_Timing* timing_ = nullptr;
-    std::string text_;
+    Nlw_TextBuffer text_;
     // The escaped path, with its final "/", of the last parent block met.
     const Nlw_NlBlock* pathOwner_ = nullptr;
     const Nlw_NlBlock* pathScope_ = nullptr;
-    std::string pathText_;
+    Nlw_TextBuffer pathText_;
     double unit_ = 1.0;  // picoseconds per written unit
     // For folding net delays into paths: the interconnect entry that drives
     // each input pin.
