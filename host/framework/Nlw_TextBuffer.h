@@ -50,6 +50,12 @@ public:
     size_t size() const { return len_; }
     bool empty() const { return len_ == 0; }
     void clear() { len_ = 0; }
+    // Lets the storage go too.
+    void Release() {
+        std::string().swap(buf_);
+        len_ = 0;
+    }
+    std::string str() const { return std::string(data(), size()); }
     void swap(Nlw_TextBuffer& other) {
         buf_.swap(other.buf_);
         std::swap(len_, other.len_);

@@ -150,8 +150,7 @@ void Nlw_Writer::Fail(const char* what) {
     fp_ = nullptr;
     Nlw_TempFile::Remove(tempName_);
     tempName_.clear();
-    buffer_.clear();
-    buffer_.shrink_to_fit();
+    buffer_.Release();
 }
 
 void Nlw_Writer::Flush() {
@@ -205,12 +204,6 @@ bool Nlw_Writer::Close() {
 }
 
 // ---- Output ----------------------------------------------------------------
-
-void Nlw_Writer::Append(const char* text, size_t len) {
-    if (!ok_ || closed_) return;
-    buffer_.append(text, len);
-    if (fp_ && buffer_.size() >= kFlushSize) Flush();
-}
 
 void Nlw_Writer::AppendIndent() {
     static const char kBlanks[] = "                                ";  // 32

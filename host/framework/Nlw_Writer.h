@@ -8,6 +8,7 @@
 #include <unordered_set>
 #include <vector>
 
+#include "framework/Nlw_TextBuffer.h"
 #include "port/Port.h"
 
 class Nlw_NetlistWriter;
@@ -94,7 +95,7 @@ public:
     // destructor when not called before. Returns true on success.
     bool Close();
     // Memory mode: the text written so far.
-    const std::string& GetMemoryText() const { return buffer_; }
+    std::string GetMemoryText() const { return buffer_.str(); }
 
     // Indentation unit.
     static constexpr int kIndentWidth = 2;
@@ -102,7 +103,13 @@ public:
     static constexpr size_t kFlushSize = 256 * 1024;
 
 private:
-    void Append(const char* text, size_t len);
+    // Every piece of output passes here: inline, so that a line of several
+    // pieces costs no calls.
+    void Append(const char* text, size_t len) {
+        if (!ok_ || closed_) return;
+        buffer_.Append(text, len);
+        if (fp_ && buffer_.size() >= kFlushSize) Flush();
+    }
     void AppendIndent();
     void Flush();
     void Fail(const char* what);
@@ -116,7 +123,7 @@ private:
     std::string targetName_;  // renamed into: the file name, or where its link leads
     Port::Stream::Access access_ = Port::Stream::Create;
     FILE* fp_ = nullptr;
-    std::string buffer_;
+    Nlw_TextBuffer buffer_;
     int indent_ = 0;
     bool ok_ = true;
     bool closed_ = false;
