@@ -90,16 +90,25 @@ bool Nlw_NlBus::IsBusName(const char* name, std::string& base, DARRAY_Util_INT32
     size_t left = 0;
     int32_t value = 0;
     if (!Nlw_NlSplitIndex(name, end, style, left, value) || left == 0) return false;
-    // Indexes are found from the last; they are given from the first.
-    std::vector<int32_t> found{value};
+    // Indexes are found from the last; they are given from the first. Names
+    // are split for every bus bit written, so the common few indexes take
+    // no allocation.
+    int32_t few[4] = {value};
+    size_t count = 1;
+    std::vector<int32_t> more;
     end = left;
     while (gMultiDimensions && Nlw_NlSplitIndex(name, end, style, left, value) && left > 0) {
-        found.push_back(value);
+        if (count < 4)
+            few[count++] = value;
+        else
+            more.push_back(value);
         end = left;
     }
     base.assign(name, end);
-    if (indexes)
-        for (auto it = found.rbegin(); it != found.rend(); ++it) indexes->Add(*it);
+    if (indexes) {
+        for (auto it = more.rbegin(); it != more.rend(); ++it) indexes->Add(*it);
+        for (size_t i = count; i-- > 0;) indexes->Add(few[i]);
+    }
     return true;
 }
 
