@@ -273,13 +273,24 @@ private:
     }
     Nlw_NlBlock* Lookup(const Nlw_NlBlock* base, const std::string& path) {
         if (index_.empty()) MakeIndex();
-        std::string key = base ? pathOf_[base] : std::string();
-        if (!path.empty()) {
-            if (!key.empty()) key += '/';
-            key += path;
+        const std::string* prefix = nullptr;
+        if (base) {
+            auto p = pathOf_.find(base);
+            if (p != pathOf_.end() && !p->second.empty()) prefix = &p->second;
         }
-        if (key.empty()) return view_.GetRootMacro();
-        auto it = index_.find(key);
+        // Paths below the top are looked up as they stand; others are
+        // joined in a buffer kept from call to call.
+        const std::string* key = &path;
+        if (prefix) {
+            key_ = *prefix;
+            if (!path.empty()) {
+                key_ += '/';
+                key_ += path;
+            }
+            key = &key_;
+        }
+        if (key->empty()) return view_.GetRootMacro();
+        auto it = index_.find(*key);
         return it == index_.end() ? nullptr : it->second;
     }
 
@@ -572,10 +583,20 @@ private:
 
     Nlw_Rvalue ParseRvalue() {
         Nlw_Rvalue r;
-        std::string text;
-        while (tok_.kind == Token::Word) {
-            text += tok_.text;
+        // Mostly one word ("1.2:1.3:1.4"), read in place; a value written
+        // in pieces ("1.2 : 1.3") is joined first.
+        std::string_view text;
+        if (tok_.kind == Token::Word) {
+            text = tok_.text;
             Advance();
+            if (tok_.kind == Token::Word) {
+                joined_.assign(text);
+                while (tok_.kind == Token::Word) {
+                    joined_ += tok_.text;
+                    Advance();
+                }
+                text = joined_;
+            }
         }
         if (tok_.kind == Token::Open) Fail("pulse rejection limits are not supported");
         Expect(Token::Close);
@@ -583,26 +604,26 @@ private:
         size_t start = 0;
         for (int field = 0;; ++field) {
             size_t colon = text.find(':', start);
-            std::string part =
-                text.substr(start, colon == std::string::npos ? colon : colon - start);
-            if (field > 2) Fail("'" + text + "' has more than three values");
+            std::string_view part =
+                text.substr(start, colon == std::string_view::npos ? colon : colon - start);
+            if (field > 2) Fail("'" + std::string(text) + "' has more than three values");
             if (!part.empty()) {
                 double v = 0;
                 const char* end = part.data() + part.size();
                 const char* begin = part.data() + (part[0] == '+' ? 1 : 0);
                 const std::from_chars_result got = std::from_chars(begin, end, v);
                 if (got.ec != std::errc() || got.ptr != end || begin == end)
-                    Fail("delay value '" + part + "' is not a number");
+                    Fail("delay value '" + std::string(part) + "' is not a number");
                 r.v[field] = v * scale_;
                 r.present |= static_cast<uint8_t>(1 << field);
             }
-            if (colon == std::string::npos) {
+            if (colon == std::string_view::npos) {
                 if (field == 0) {
                     // One value stands for all three.
                     r.v[1] = r.v[2] = r.v[0];
                     r.present = r.present ? 7 : 0;
                 } else if (field != 2) {
-                    Fail("'" + text + "' is neither one value nor three");
+                    Fail("'" + std::string(text) + "' is neither one value nor three");
                 }
                 break;
             }
@@ -638,6 +659,8 @@ private:
     bool sawVersion_ = false;
     size_t unmatched_ = 0;
     std::unordered_map<std::string, Nlw_NlBlock*> index_;
+    std::string key_;     // Lookup's work space
+    std::string joined_;  // ParseRvalue's work space
     const Nlw_NlBlock* lastBase_ = nullptr;
     std::string lastPath_;
     Nlw_NlBlock* lastFound_ = nullptr;
