@@ -6,7 +6,8 @@ usage: compare_models.py SHARE_DIR WORK_DIR
 One bench instantiates every cell of cells.dat (except the pads, which
 have no behaviour, and V_DCM, whose functional model only passes its clock
 through) with random parameter values and random inputs, and is simulated
-twice with Icarus Verilog: with the timcells and the chipwide module, and
+with Icarus Verilog: with the timcells and the chipwide module (once with
+their table primitives, once with the plain bodies of CELLS_NO_UDP), and
 with the funcells. Clock pins run from one clock (C1 from its inverse, as a
 dual-rate flop expects); reset-like pins are active in about one cycle in
 eight (a preset never together with a clear); IB of a differential buffer
@@ -34,14 +35,17 @@ CYCLES = 200
 SETTLE = 20
 
 
-def literal(ptype, default, rng):
+def literal(ptype, default, draw, copy):
+    """A random value, its complement in the second copy of a cell (both
+    values of a flop's INIT, every bit of a table both ways)."""
     if ptype in ("HV", "BV"):
         width = int(default.split("'", 1)[0])
-        return f"{width}'h{rng.getrandbits(width):x}"
+        value = random.Random(draw).getrandbits(width)
+        return f"{width}'h{value ^ (copy * ((1 << width) - 1)):x}"
     return None
 
 
-def bench(inst, rng):
+def bench(inst):
     lines = ["`timescale 1 ns/1 ps", "module models_tb;", "  reg clk;", "  reg [31:0] r0, r1, r2;",
              "  integer seed, cycle;"]
     shown = []
@@ -53,13 +57,13 @@ def bench(inst, rng):
         return bit - 1
 
     body = []
-    for cell in inst.cells:
+    for cell, copy in [(c, k) for c in inst.cells for k in (0, 1)]:
         if cell.pad or cell.name in SKIP:
             continue
-        inst_name = f"u_{cell.name}"
+        inst_name = f"u{copy}_{cell.name}"
         params = []
         for name, ptype, default in inst.simprops.get(cell.name, []):
-            value = literal(ptype, default, rng)
+            value = literal(ptype, default, f"{cell.name}.{name}", copy)
             if value is not None:
                 params.append(f".{name}({value})")
         conns = []
@@ -127,8 +131,8 @@ def bench(inst, rng):
     return "\n".join(lines) + "\n"
 
 
-def simulate(files, roots, exe, work):
-    cmd = ["iverilog", "-g2005", "-o", exe]
+def simulate(files, roots, exe, work, defines=()):
+    cmd = ["iverilog", "-g2005", "-o", exe] + [f"-D{d}" for d in defines]
     for root in roots:
         cmd += ["-s", root]
     r = subprocess.run(cmd + files, cwd=work, capture_output=True, text=True)
@@ -145,24 +149,27 @@ def main():
     deps = recursive_inclusions(inst.acd)
     tb = os.path.join(work, "models_tb.v")
     with open(tb, "w") as f:
-        f.write(bench(inst, random.Random(11)))
+        f.write(bench(inst))
     used = [c.name for c in inst.cells if not c.pad and c.name not in SKIP]
     names = []
     for name in used:
         for model in deps.get(name.upper(), []) + [name]:
             if model not in names:
                 names.append(model)
+    timcells = [tb, os.path.join(inst.src, "chipwide.v")] + [inst.model("timcells", n) for n in names]
     try:
-        tim = simulate([tb, os.path.join(inst.src, "chipwide.v")] +
-                       [inst.model("timcells", n) for n in names],
-                       ["models_tb", "chipwide"], os.path.join(work, "tim.vvp"), work)
-        fun = simulate([tb] + [inst.model("funcells", n) for n in names], ["models_tb"],
-                       os.path.join(work, "fun.vvp"), work)
+        # The timcells twice: with their table primitives and with the plain
+        # bodies that tools without tables read.
+        tim = simulate(timcells, ["models_tb", "chipwide"], os.path.join(work, "tim.vvp"), work)
+        tim += simulate(timcells, ["models_tb", "chipwide"], os.path.join(work, "plain.vvp"), work,
+                        ["CELLS_NO_UDP"])
+        fun = 2 * simulate([tb] + [inst.model("funcells", n) for n in names], ["models_tb"],
+                           os.path.join(work, "fun.vvp"), work)
     except RuntimeError as e:
         print(f"FAIL: {e}")
         return 1
-    if len(tim) != 2 * CYCLES or len(fun) != 2 * CYCLES:
-        print(f"FAIL: {len(tim)} and {len(fun)} lines printed, {2 * CYCLES} expected")
+    if len(tim) != 4 * CYCLES or len(fun) != 4 * CYCLES:
+        print(f"FAIL: {len(tim)} and {len(fun)} lines printed, {4 * CYCLES} expected")
         return 1
     differ = {}
     for a, b in zip(tim, fun):
