@@ -3,7 +3,8 @@
 # test design (tests/data/designs/cpu_bus.v, register file, ALU and bus,
 # with W=8): flow/rtl2json, qdb2ver -ism with the timing models, one
 # random-stimulus bench for both, the best of three runs of each. Prints the
-# CPU seconds of each simulation and their ratio.
+# CPU seconds of each simulation and their ratio, for the flow's netlist and
+# for the one of rtl2json -splitnets (single-bit nets below the top).
 #
 # Usage: bench/sim_ratio.sh [BUILD_DIR] [CYCLES] [INSTALLATION]
 #   INSTALLATION: another installation's models (VORNIX), to compare model
@@ -23,11 +24,14 @@ design="$src/tests/data/designs/cpu_bus.v"
 lib="$src/tests/tools/lib"
 
 "$src/flow/rtl2json" -P W=8 cpu_bus "$out/cpu.json" "$design" >/dev/null
-VORNIX="$models" "$build/qdb2ver" -ism -quiet -w "$out/cpu.json" "$out/net.v" >/dev/null
+"$src/flow/rtl2json" -splitnets -P W=8 cpu_bus "$out/split.json" "$design" >/dev/null
 python3 "$lib/make_tb.py" "$out/cpu.json" cpu_bus "$cycles" 1 >"$out/tb.v"
 python3 "$lib/make_tb.py" "$out/cpu.json" cpu_bus "$cycles" 1 W=8 >"$out/rtl_tb.v"
 iverilog -g2005 -o "$out/rtl.vvp" -s nlw_tb "$out/rtl_tb.v" "$design"
-iverilog -g2005 -o "$out/net.vvp" -s nlw_tb -s chipwide "$out/tb.v" "$out/net.v"
+for n in cpu split; do
+    VORNIX="$models" "$build/qdb2ver" -ism -quiet -w "$out/$n.json" "$out/$n.v" >/dev/null
+    iverilog -g2005 -o "$out/$n.vvp" -s nlw_tb -s chipwide "$out/tb.v" "$out/$n.v"
+done
 
 best() {  # vvp file: the least user CPU seconds of three runs
     local b="" t i
@@ -39,7 +43,10 @@ best() {  # vvp file: the least user CPU seconds of three runs
     echo "$b"
 }
 rtl=$(best "$out/rtl.vvp")
-net=$(best "$out/net.vvp")
-cells=$(grep '^  V_' "$out/net.v" | grep -vc '^  V_LUT[0-9]_T[0-9] ' || true)
-printf 'cpu_bus W=8, %s cells, %s cycles: RTL %s s, gate level %s s, ratio %s\n' "$cells" "$cycles" \
-    "$rtl" "$net" "$(awk -v r="$rtl" -v n="$net" 'BEGIN { printf "%.1f", (r > 0) ? n / r : 0 }')"
+cells=$(grep '^  V_' "$out/cpu.v" | grep -vc '^  V_LUT[0-9]_T[0-9] ' || true)
+for n in cpu split; do
+    net=$(best "$out/$n.vvp")
+    printf 'cpu_bus W=8%s, %s cells, %s cycles: RTL %s s, gate level %s s, ratio %s\n' \
+        "$([ $n = split ] && echo ' -splitnets' || true)" "$cells" "$cycles" "$rtl" "$net" \
+        "$(awk -v r="$rtl" -v n="$net" 'BEGIN { printf "%.1f", (r > 0) ? n / r : 0 }')"
+done

@@ -61,11 +61,13 @@ prove() {  # GOLD NETLIST TOP [GOLD...]
         for p in "${params[@]+"${params[@]}"}"; do echo "chparam -set ${p%%=*} ${p#*=} $top"; done
         # Memories, also the ROMs yosys makes of case tables, as flops and
         # logic that the equivalence passes understand.
-        echo "prep -top $top; memory_map; setattr -mod -unset keep_hierarchy; flatten"
+        # Single-bit nets on both sides, so that the names match whether the
+        # netlist keeps buses or not (rtl2json -splitnets).
+        echo "prep -top $top; memory_map; setattr -mod -unset keep_hierarchy; flatten; splitnets"
         echo "async2sync; opt_clean; rename $top gold; design -stash gold"
         echo "read_verilog $net; read_verilog $funcells/*.v"
         echo "read_verilog -noblackbox -DSIMLIB_NOCHECKS +/simcells.v +/simlib.v"
-        echo "hierarchy -top $top; proc; flatten; async2sync; opt_clean; rename $top gate"
+        echo "hierarchy -top $top; proc; flatten; splitnets; async2sync; opt_clean; rename $top gate"
         echo "design -stash gate; design -copy-from gold -as gold gold"
         echo "design -copy-from gate -as gate gate; equiv_make gold gate equiv"
         echo "hierarchy -top equiv; equiv_simple -seq 5; equiv_induct -seq 5; equiv_status -assert"
