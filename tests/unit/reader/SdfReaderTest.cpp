@@ -128,6 +128,13 @@ TEST(SdfReader, KeepsValuesEdgesAndPinsOfAnEntry) {
     EXPECT_DOUBLE_EQ(v.v[0], 100.0);
     EXPECT_DOUBLE_EQ(v.v[2], 300.0);
     EXPECT_EQ(r.timing.values[path.firstValue + 1].present, 0);
+    // A path's own edge stays, whatever edge the checks give the clock.
+    r = ReadSdf(design,
+                std::string(kHead) +
+                    "(CELL (CELLTYPE \"FD\") (INSTANCE u1/r) (DELAY (ABSOLUTE"
+                    " (IOPATH (posedge C) Q (1)))) (TIMINGCHECK (SETUP D (negedge C) (2)))))");
+    ASSERT_EQ(r.timing.entries.size(), 2u);
+    EXPECT_EQ(r.timing.entries[0].edge1, NLW_EDGE_POS);
 }
 
 TEST(NominalTiming, GivesEveryCellItsLibraryArcsAndEveryNetAZeroDelay) {
