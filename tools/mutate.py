@@ -122,7 +122,7 @@ def main():
     chosen, total = sample(args.seed, args.count)
     if args.only:
         only = set(args.only.split(","))
-        chosen = [c for c in chosen[:args.count] if "%s:%d" % (c[0], c[1] + 1) in only]
+        chosen = [c for c in chosen if "%s:%d" % (c[0], c[1] + 1) in only]
     if args.list:
         for path, i, kind, old, new in chosen[:args.count]:
             print("%s:%d %s\n  - %s\n  + %s" % (path, i + 1, kind, old.strip(), new.strip()))
