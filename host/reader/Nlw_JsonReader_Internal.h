@@ -159,7 +159,7 @@ struct Module {
     std::string_view name;  // nameText
     Text nameText = "";
     // Where the module's object lies in the text, and the object while it
-    // is the one parsed (see OpenModule).
+    // is the one parsed (see ParseAhead).
     size_t textBegin = 0, textEnd = 0;
     simdjson::dom::object json;
     bool blackbox = false;
@@ -301,14 +301,12 @@ struct Design {
 };
 
 // Finding and parsing the modules (Nlw_JsonReader_Split.cpp). SplitModules
-// lists the modules of the text with their names and places; OpenModule
-// parses one of them into m.json, which stays valid until the next module
-// is opened. Unless Design::exactSplit, the places are judged by the
+// lists the modules of the text with their names and places; ParseAhead
+// (below) parses them into m.json. Unless Design::exactSplit, the places are judged by the
 // layout, and any fault met shows as GuessFailed, from either, before any
 // module is digested; the list is then made again, exactly.
 struct GuessFailed {};
 void SplitModules(Design& d);
-void OpenModule(Design& d, Module& m);
 // The fault of a module's text: while the places are judged by the layout,
 // GuessFailed; else the message a parse of the whole text gives.
 [[noreturn]] void OpenFailed(Design& d);

@@ -6,7 +6,7 @@
 #include <cstdio>
 #include <cstdlib>
 #include <limits>
-#include <memory>
+#include <optional>
 #include <unordered_map>
 
 #include "reader/Nlw_JsonReader_Internal.h"
@@ -389,10 +389,13 @@ namespace {
 
 void ReadModuleListOnce(Design& d) {
     SplitModules(d);
+    std::vector<uint32_t> all(d.modules.size());
+    for (uint32_t i = 0; i < all.size(); ++i) all[i] = i;
     for (uint32_t i = 0; i < d.modules.size(); ++i)
         if (!d.moduleIndex.emplace(d.modules[i].name, i).second) {
             // A fault of the text anywhere is reported first.
-            for (Module& m : d.modules) OpenModule(d, m);
+            ParseAhead check(d, all);
+            for (size_t k = 0; k < all.size(); ++k) check.Open(k);
             Fail("module '" + std::string(d.modules[i].name) + "' is defined twice");
         }
     if (d.modules.empty()) Fail("no modules");
@@ -400,9 +403,7 @@ void ReadModuleListOnce(Design& d) {
     // The first fault of a module's content is reported only when every
     // module has been parsed, so that a fault of the text comes first.
     std::vector<uint32_t> stamp(d.modules.size(), 0);
-    std::unique_ptr<ReadError> first;
-    std::vector<uint32_t> all(d.modules.size());
-    for (uint32_t i = 0; i < all.size(); ++i) all[i] = i;
+    std::optional<ReadError> first;
     ParseAhead ahead(d, all);
     for (uint32_t i = 0; i < d.modules.size(); ++i) {
         Module& m = d.modules[i];
@@ -413,7 +414,7 @@ void ReadModuleListOnce(Design& d) {
             ReadPorts(d, m);
             ReadChildren(d, m, i, stamp);
         } catch (ReadError& e) {
-            first = std::make_unique<ReadError>(std::move(e));
+            first = std::move(e);
         }
     }
     if (first) throw *first;

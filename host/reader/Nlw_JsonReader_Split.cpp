@@ -151,31 +151,21 @@ void CheckValue(Design& d, size_t begin, size_t end) {
         FailWhole(d, "malformed JSON");
 }
 
-// Lists the modules of the "modules" object that opens at i; returns the
-// place after its end.
-size_t ScanModules(Design& d, const TopScan& s, size_t i) {
+// Steps over the members of the object that opens at i, calling
+// member(keyBegin, keyEnd, value) for each, which returns the end of the
+// value. Returns the place after the object.
+template <typename Member>
+size_t ForEachMember(Design& d, const TopScan& s, size_t i, Member member) {
     i = s.SkipSpace(i + 1);
     if (i < d.textLen && d.text[i] == '}') return i + 1;
     for (;;) {
         if (i >= d.textLen || d.text[i] != '"') FailWhole(d, "malformed JSON");
         const size_t keyBegin = i;
-        size_t keyEnd = s.StringEnd(i);
+        const size_t keyEnd = s.StringEnd(i);
         if (keyEnd == TopScan::npos) FailWhole(d, "malformed JSON");
-        Module m;
-        m.name = PublicName(KeyText(d, d.text, i, keyEnd));
         i = s.SkipSpace(keyEnd);
         if (i >= d.textLen || d.text[i] != ':') FailWhole(d, "malformed JSON");
-        i = s.SkipSpace(i + 1);
-        size_t end =
-            d.exactSplit || d.text[i] != '{' ? TopScan::npos : s.GuessObjectEnd(keyBegin, i);
-        if (end == TopScan::npos) end = s.ValueEnd(i);
-        if (end == TopScan::npos) FailWhole(d, "malformed JSON");
-        m.textBegin = i;
-        m.textEnd = end;
-        m.nameText = d.pool.Keep(m.name);
-        m.name = m.nameText;
-        d.modules.push_back(std::move(m));
-        i = s.SkipSpace(end);
+        i = s.SkipSpace(member(keyBegin, keyEnd, s.SkipSpace(i + 1)));
         if (i < d.textLen && d.text[i] == ',') {
             i = s.SkipSpace(i + 1);
             continue;
@@ -183,6 +173,24 @@ size_t ScanModules(Design& d, const TopScan& s, size_t i) {
         if (i < d.textLen && d.text[i] == '}') return i + 1;
         FailWhole(d, "malformed JSON");
     }
+}
+
+// Lists the modules of the "modules" object that opens at i; returns the
+// place after its end.
+size_t ScanModules(Design& d, const TopScan& s, size_t i) {
+    return ForEachMember(d, s, i, [&](size_t keyBegin, size_t keyEnd, size_t at) {
+        size_t end =
+            d.exactSplit || d.text[at] != '{' ? TopScan::npos : s.GuessObjectEnd(keyBegin, at);
+        if (end == TopScan::npos) end = s.ValueEnd(at);
+        if (end == TopScan::npos) FailWhole(d, "malformed JSON");
+        Module m;
+        m.nameText = d.pool.Keep(PublicName(KeyText(d, d.text, keyBegin, keyEnd)));
+        m.name = m.nameText;
+        m.textBegin = at;
+        m.textEnd = end;
+        d.modules.push_back(std::move(m));
+        return end;
+    });
 }
 
 }  // namespace
@@ -199,43 +207,23 @@ void SplitModules(Design& d) {
     TopScan s(d.text, d.textLen);
     size_t i = s.SkipSpace(0);
     if (i >= d.textLen || d.text[i] != '{') FailWhole(d, "expected a JSON object at the top level");
-    i = s.SkipSpace(i + 1);
     bool found = false, scanned = false;
-    if (i < d.textLen && d.text[i] == '}') {
-        ++i;
-    } else {
-        for (;;) {
-            if (i >= d.textLen || d.text[i] != '"') FailWhole(d, "malformed JSON");
-            size_t keyEnd = s.StringEnd(i);
-            if (keyEnd == TopScan::npos) FailWhole(d, "malformed JSON");
-            const bool isModules = KeyText(d, d.text, i, keyEnd) == "modules";
-            i = s.SkipSpace(keyEnd);
-            if (i >= d.textLen || d.text[i] != ':') FailWhole(d, "malformed JSON");
-            i = s.SkipSpace(i + 1);
-            // The first "modules" member is the one read, as a lookup by
-            // key finds it; the rest of the top level is only checked.
-            size_t end;
-            if (isModules && !found && d.text[i] == '{') {
-                end = ScanModules(d, s, i);
-                scanned = true;
-            } else {
-                end = s.ValueEnd(i);
-                if (end == TopScan::npos) FailWhole(d, "malformed JSON");
-                CheckValue(d, i, end);
-            }
-            found = found || isModules;
-            i = s.SkipSpace(end);
-            if (i < d.textLen && d.text[i] == ',') {
-                i = s.SkipSpace(i + 1);
-                continue;
-            }
-            if (i < d.textLen && d.text[i] == '}') {
-                ++i;
-                break;
-            }
-            FailWhole(d, "malformed JSON");
+    i = ForEachMember(d, s, i, [&](size_t keyBegin, size_t keyEnd, size_t at) {
+        const bool isModules = KeyText(d, d.text, keyBegin, keyEnd) == "modules";
+        // The first "modules" member is the one read, as a lookup by key
+        // finds it; the rest of the top level is only checked.
+        size_t end;
+        if (isModules && !found && d.text[at] == '{') {
+            end = ScanModules(d, s, at);
+            scanned = true;
+        } else {
+            end = s.ValueEnd(at);
+            if (end == TopScan::npos) FailWhole(d, "malformed JSON");
+            CheckValue(d, at, end);
         }
-    }
+        found = found || isModules;
+        return end;
+    });
     if (s.SkipSpace(i) != d.textLen) FailWhole(d, "malformed JSON");
     if (!scanned) {
         // A "modules" member that is not an object may still hide a fault
@@ -247,18 +235,6 @@ void SplitModules(Design& d) {
 
 void OpenFailed(Design& d) {
     FailWhole(d, "malformed JSON");
-}
-
-void OpenModule(Design& d, Module& m) {
-    simdjson::dom::element e;
-    simdjson::error_code err = d.parser
-                                   .parse(reinterpret_cast<const uint8_t*>(d.text + m.textBegin),
-                                          m.textEnd - m.textBegin, false)
-                                   .get(e);
-    if (err == simdjson::MEMALLOC) throw std::bad_alloc();
-    if (err) FailWhole(d, "malformed JSON");
-    if (e.get_object().get(m.json))
-        Fail("module '" + std::string(m.name) + "': expected an object");
 }
 
 }  // namespace nlw_json

@@ -18,6 +18,23 @@ bool IsPlain(char c) {
     return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || (c >= '0' && c <= '9') || c == '_';
 }
 
+// Appends [name, end) as an SDF identifier: a backslash before every
+// character other than a letter, a digit or "_".
+void AppendEscapedTo(Nlw_TextBuffer& out, const char* name, const char* end) {
+    const char* run = name;
+    for (const char* p = name; p != end; ++p) {
+        if (IsPlain(*p)) continue;
+        out.Append(run, static_cast<size_t>(p - run));
+        out += '\\';
+        run = p;
+    }
+    out.Append(run, static_cast<size_t>(end - run));
+}
+
+void AppendEscapedTo(Nlw_TextBuffer& out, const char* name) {
+    AppendEscapedTo(out, name, name + std::strlen(name));
+}
+
 const char* EdgeWord(uint8_t edge) {
     return edge == NLW_EDGE_POS ? "posedge" : edge == NLW_EDGE_NEG ? "negedge" : nullptr;
 }
@@ -47,12 +64,9 @@ bool Nlw_SdfWriter::IsTimingSource(Nlw_NetlistWriter* nlw, const char* fileName)
 }
 
 std::string Nlw_SdfWriter::EscapeName(const char* name) {
-    std::string out;
-    for (const char* p = name; *p; ++p) {
-        if (!IsPlain(*p)) out += '\\';
-        out += *p;
-    }
-    return out;
+    Nlw_TextBuffer out;
+    AppendEscapedTo(out, name);
+    return out.str();
 }
 
 void Nlw_SdfWriter::MakeNetDelayIndex() {
@@ -279,17 +293,6 @@ void Nlw_SdfWriter::AppendNumber(double ps) {
     text_.Commit(static_cast<size_t>(std::to_chars(at, at + 24, units).ptr - at));
 }
 
-void Nlw_SdfWriter::AppendEscaped(const char* name) {
-    const char* run = name;
-    for (const char* p = name; *p; ++p) {
-        if (IsPlain(*p)) continue;
-        text_.Append(run, static_cast<size_t>(p - run));
-        text_ += '\\';
-        run = p;
-    }
-    text_ += run;
-}
-
 void Nlw_SdfWriter::AppendInstancePath(const Nlw_NlBlock* block, const Nlw_NlBlock* scope) {
     // Cells come block by block, so the path of the parent is the one of
     // the entry before, most of the time.
@@ -299,31 +302,18 @@ void Nlw_SdfWriter::AppendInstancePath(const Nlw_NlBlock* block, const Nlw_NlBlo
         if (parent != pathOwner_ || scope != pathScope_) {
             pathOwner_ = parent;
             pathScope_ = scope;
-            Nlw_TextBuffer saved;
-            saved.swap(text_);
-            const Nlw_NlBlock* chain[64];
-            size_t n = 0;
-            std::vector<const Nlw_NlBlock*> deep;
-            for (const Nlw_NlBlock* b = parent; b && b != scope; b = b->GetParent()) {
-                if (n < 64)
-                    chain[n++] = b;
-                else
-                    deep.push_back(b);
+            chain_.clear();
+            for (const Nlw_NlBlock* b = parent; b && b != scope; b = b->GetParent())
+                chain_.push_back(b);
+            pathText_.clear();
+            for (size_t i = chain_.size(); i-- > 0;) {
+                AppendEscapedTo(pathText_, chain_[i]->GetWritableName());
+                pathText_ += '/';
             }
-            for (size_t i = deep.size(); i-- > 0;) {
-                AppendEscaped(deep[i]->GetWritableName());
-                text_ += '/';
-            }
-            for (size_t i = n; i-- > 0;) {
-                AppendEscaped(chain[i]->GetWritableName());
-                text_ += '/';
-            }
-            pathText_.swap(text_);
-            text_.swap(saved);
         }
         text_ += pathText_;
     }
-    AppendEscaped(block->GetWritableName());
+    AppendEscapedTo(text_, block->GetWritableName());
 }
 
 void Nlw_SdfWriter::AppendPinName(const Nlw_NlPin* pin) {
@@ -332,15 +322,12 @@ void Nlw_SdfWriter::AppendPinName(const Nlw_NlPin* pin) {
         // A bus member "D[3]": the base is an identifier, the index stays.
         const char* bracket = std::strrchr(name, '[');
         if (bracket && bracket != name) {
-            for (const char* p = name; p != bracket; ++p) {
-                if (!IsPlain(*p)) text_ += '\\';
-                text_ += *p;
-            }
+            AppendEscapedTo(text_, name, bracket);
             text_ += bracket;
             return;
         }
     }
-    AppendEscaped(name);
+    AppendEscapedTo(text_, name);
 }
 
 void Nlw_SdfWriter::AppendPinPath(const Nlw_NlPin* pin, const Nlw_NlBlock* scope) {

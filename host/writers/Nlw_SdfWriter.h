@@ -51,7 +51,6 @@ private:
     // asks for net delays folded into paths.
     void AppendValues(const Nlw_TimingEntry& e);
     void AppendNumber(double ps);
-    void AppendEscaped(const char* name);
     // "a/b/c" of the written instance names from below scope down to block.
     void AppendInstancePath(const Nlw_NlBlock* block, const Nlw_NlBlock* scope);
     void AppendPinName(const Nlw_NlPin* pin);
@@ -65,7 +64,8 @@ private:
     const Nlw_NlBlock* pathOwner_ = nullptr;
     const Nlw_NlBlock* pathScope_ = nullptr;
     Nlw_TextBuffer pathText_;
-    double unit_ = 1.0;  // picoseconds per written unit
+    std::vector<const Nlw_NlBlock*> chain_;  // work space of the path
+    double unit_ = 1.0;                      // picoseconds per written unit
     // For folding net delays into paths: the interconnect entry that drives
     // each input pin.
     std::unordered_map<const Nlw_NlPin*, uint32_t> netDelayOf_;
