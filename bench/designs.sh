@@ -22,7 +22,7 @@ make_design() {  # file command...: runs the command to write file.tmp once
 }
 cpu_json="$data/minicpu.json"
 if [ ! -s "$cpu_json" ]; then
-    VORNIX= "$bench_dir/../flow/rtl2json" -noiopad minicpu "$cpu_json.tmp" "$bench_dir/rtl/minicpu.v" >/dev/null &&
+    VORNIX= "$bench_dir/../flow/rtl2json" -noiopad -keepbuses minicpu "$cpu_json.tmp" "$bench_dir/rtl/minicpu.v" >/dev/null &&
         mv "$cpu_json.tmp" "$cpu_json"
 fi
 for n in "${sizes[@]}"; do

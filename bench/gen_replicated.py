@@ -5,7 +5,7 @@ design holds about N leaf cells, keeping yosys's own text of the module.
 The copies cpu_0 ... cpu_K-1 are chained by a new top module: each copy's
 "instr" input is the previous copy's "dout" output, the first takes the top's
 "instr"; all share clk, rst and din; the last copy's outputs are the top's.
-Used with the small CPU of bench/rtl, synthesized by flow/rtl2json -noiopad.
+Used with the small CPU of bench/rtl, synthesized by flow/rtl2json -noiopad -keepbuses.
 
 Usage: gen_replicated.py SYNTH.json MODULE N OUT.json
 """

@@ -1,14 +1,16 @@
 #!/usr/bin/env bash
 # Gate-level against RTL simulation time in Icarus Verilog on the CPU-like
 # test design (tests/data/designs/cpu_bus.v, register file, ALU and bus,
-# with W=8): flow/rtl2json, qdb2ver -ism with the timing models, one
-# random-stimulus bench for both, the best of three runs of each. Prints the
-# CPU seconds of each simulation and their ratio, for the flow's netlist and
-# for the one of rtl2json -splitnets (single-bit nets below the top).
+# W=8 unless told otherwise): flow/rtl2json, qdb2ver -ism with the timing
+# models, one random-stimulus bench for both, the best of three runs of
+# each. Prints the CPU seconds of each simulation and their ratio, for the
+# flow's netlist (single-bit nets below the top) and for the one of
+# rtl2json -keepbuses, and stops if a netlist's outputs differ from the RTL's.
 #
-# Usage: bench/sim_ratio.sh [BUILD_DIR] [CYCLES] [INSTALLATION]
+# Usage: bench/sim_ratio.sh [BUILD_DIR] [CYCLES] [INSTALLATION] [PARAMS]
 #   INSTALLATION: another installation's models (VORNIX), to compare model
 #   versions; the default is the tree's share/.
+#   PARAMS: the design's parameters, as "W=32 NREG=16" (default "W=8").
 set -euo pipefail
 
 here="$(cd "$(dirname "${BASH_SOURCE[0]}")" && pwd)"
@@ -16,6 +18,9 @@ src="$(cd "$here/.." && pwd)"
 build="${1:-build}"
 cycles="${2:-20000}"
 models="${3:-$src/share}"
+read -r -a params <<<"${4:-W=8}"
+flow_params=()
+for p in "${params[@]}"; do flow_params+=(-P "$p"); done
 out="$(mktemp -d)"
 trap 'rm -rf "$out"' EXIT
 
@@ -23,12 +28,12 @@ trap 'rm -rf "$out"' EXIT
 design="$src/tests/data/designs/cpu_bus.v"
 lib="$src/tests/tools/lib"
 
-"$src/flow/rtl2json" -P W=8 cpu_bus "$out/cpu.json" "$design" >/dev/null
-"$src/flow/rtl2json" -splitnets -P W=8 cpu_bus "$out/split.json" "$design" >/dev/null
+"$src/flow/rtl2json" "${flow_params[@]}" cpu_bus "$out/cpu.json" "$design" >/dev/null
+"$src/flow/rtl2json" -keepbuses "${flow_params[@]}" cpu_bus "$out/buses.json" "$design" >/dev/null
 python3 "$lib/make_tb.py" "$out/cpu.json" cpu_bus "$cycles" 1 >"$out/tb.v"
-python3 "$lib/make_tb.py" "$out/cpu.json" cpu_bus "$cycles" 1 W=8 >"$out/rtl_tb.v"
+python3 "$lib/make_tb.py" "$out/cpu.json" cpu_bus "$cycles" 1 "${params[@]}" >"$out/rtl_tb.v"
 iverilog -g2005 -o "$out/rtl.vvp" -s nlw_tb "$out/rtl_tb.v" "$design"
-for n in cpu split; do
+for n in cpu buses; do
     VORNIX="$models" "$build/qdb2ver" -ism -quiet -w "$out/$n.json" "$out/$n.v" >/dev/null
     iverilog -g2005 -o "$out/$n.vvp" -s nlw_tb -s chipwide "$out/tb.v" "$out/$n.v"
 done
@@ -43,10 +48,13 @@ best() {  # vvp file: the least user CPU seconds of three runs
     echo "$b"
 }
 rtl=$(best "$out/rtl.vvp")
+cp "$out/log.1" "$out/rtl.log"
 cells=$(grep '^  V_' "$out/cpu.v" | grep -vc '^  V_LUT[0-9]_T[0-9] ' || true)
-for n in cpu split; do
+for n in cpu buses; do
     net=$(best "$out/$n.vvp")
-    printf 'cpu_bus W=8%s, %s cells, %s cycles: RTL %s s, gate level %s s, ratio %s\n' \
-        "$([ $n = split ] && echo ' -splitnets' || true)" "$cells" "$cycles" "$rtl" "$net" \
+    python3 "$lib/compare_sim.py" "$out/rtl.log" "$out/log.1" >/dev/null ||
+        { echo "sim_ratio.sh: the $n netlist's outputs differ from the RTL's" >&2; exit 1; }
+    printf 'cpu_bus %s%s, %s cells, %s cycles: RTL %s s, gate level %s s, ratio %s\n' \
+        "${params[*]}" "$([ $n = buses ] && echo ' -keepbuses' || true)" "$cells" "$cycles" "$rtl" "$net" \
         "$(awk -v r="$rtl" -v n="$net" 'BEGIN { printf "%.1f", (r > 0) ? n / r : 0 }')"
 done

@@ -62,7 +62,7 @@ prove() {  # GOLD NETLIST TOP [GOLD...]
         # Memories, also the ROMs yosys makes of case tables, as flops and
         # logic that the equivalence passes understand.
         # Single-bit nets on both sides, so that the names match whether the
-        # netlist keeps buses or not (rtl2json -splitnets).
+        # netlist keeps buses (rtl2json -keepbuses) or not.
         echo "prep -top $top; memory_map; setattr -mod -unset keep_hierarchy; flatten; splitnets"
         echo "async2sync; opt_clean; rename $top gold; design -stash gold"
         echo "read_verilog $net; read_verilog $funcells/*.v"

@@ -1,3 +1,4 @@
+// nlw-test: flow-options -keepbuses
 // Hierarchy with buses in both directions: two counter instances with
 // synchronous reset, enable and load, and a comparator module.
 module counter_hier (

@@ -1,6 +1,5 @@
 // nlw-test: param W=8
 // nlw-test: pins cpu_bus.pins
-// nlw-test: flow-options -splitnets
 //
 // A small CPU-like core: a register file the RTL leaves uninitialised, an
 // ALU with flags, and a bus interface with a load that waits for the bus.
