@@ -36,13 +36,17 @@ bool IsIllegalChar(unsigned char c, bool first, bool writeEscapedNames) {
 
 bool Nlw_VerilogLU::IsLegal(Port::String name, bool isBused) {
     if (nlw != nullptr && nlw->IsEscaped(name.c_str())) return true;
-    std::string text = name.str();
-    if (isBused) {
-        std::string base;
-        DARRAY_Util_INT32 indexes;
-        if (Nlw_NlBus::IsBusName(name.c_str(), base, &indexes)) text.swap(base);
+    // The base part of a bus-bit name goes to working buffers that every
+    // call reuses: the legalizer asks this of every name in the design.
+    static std::string base;
+    static DARRAY_Util_INT32 indexes;
+    const char* text = name.c_str();
+    size_t length = name.length();
+    if (isBused && Nlw_NlBus::IsBusName(text, base, &indexes)) {
+        text = base.c_str();
+        length = base.size();
     }
-    for (size_t i = 0; i < text.size(); ++i) {
+    for (size_t i = 0; i < length; ++i) {
         if (IsIllegalChar(static_cast<unsigned char>(text[i]), i == 0, writeEscapedNames))
             return false;
     }

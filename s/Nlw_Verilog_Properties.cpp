@@ -22,9 +22,25 @@ const Nlw_Property* FindDefinition(const Nlw_SimPropTable& table, const char* ty
                                    const Port::String& parameterName) {
     // The table orders its keys ignoring case, so find gives the entry whose
     // key equals the type name ignoring case.
-    const auto entry = table.find(Port::String(typeName));
+    const auto entry = table.find(typeName ? typeName : "");
     if (entry == table.end() || entry->second == nullptr) return nullptr;
     return Nlw_Property::Find(*entry->second, parameterName.c_str());
+}
+
+// The width part of a default such as 16'h0000: the text before the
+// apostrophe when the default is exactly two non-empty pieces around
+// apostrophes, or empty.
+std::string DefaultWidthText(const char* text) {
+    std::string first;
+    size_t pieces = 0;
+    for (const char* p = text; *p;) {
+        const char* end = p;
+        while (*end && *end != '\'') ++end;
+        if (end != p && ++pieces == 1) first.assign(p, end);
+        if (pieces > 2) return std::string();
+        p = *end ? end + 1 : end;
+    }
+    return pieces == 2 ? first : std::string();
 }
 
 // A sized vector literal such as 16'hABCD or 4'b0101. The width comes from the
@@ -35,9 +51,8 @@ Port::String MakeVectorText(Nlw_NetlistWriter& nlw, const Nlw_Property& definiti
                             const Port::String& parameterName, const char* text, bool hex) {
     Port::String value(text);
     const uint32_t ownWidth = static_cast<uint32_t>(hex ? 4 * value.length() : value.length());
-    const std::vector<Port::String> pieces =
-        Port::String::Split(definition.GetDefault().c_str(), "'", true, "", "");
-    std::string widthText = pieces.size() == 2 ? pieces[0].str() : std::to_string(ownWidth);
+    std::string widthText = DefaultWidthText(definition.GetDefault().c_str());
+    if (widthText.empty()) widthText = std::to_string(ownWidth);
     bool isNumber = false;
     uint32_t width = Port::String(widthText).GetUINT32(&isNumber);
     // A width that is no decimal number, or zero, would make an unusable
@@ -56,7 +71,10 @@ Port::String MakeVectorText(Nlw_NetlistWriter& nlw, const Nlw_Property& definiti
                                    parameterName.c_str());
         nlw.PadOrTrim(digits, value, "0");
     }
-    return Port::String(vorform(hex ? "%s'h%s" : "%s'b%s", widthText.c_str(), value.c_str()));
+    std::string& literal = widthText;
+    literal += hex ? "'h" : "'b";
+    literal += value.str();
+    return Port::String(literal);
 }
 
 // A value the literal of its kind can hold: hexadecimal ('h') or binary
@@ -111,7 +129,7 @@ unsigned char Nlw_Verilog::AddIfSimulatableProperty(Nlw_NlBlock* block, Vdm_Prop
             break;
         case VDM_PROP_INT:
             if (TypeIs(*definition, "I")) {
-                text = vorform("%d", static_cast<int>(property->GetInt32()));
+                text = std::to_string(static_cast<int>(property->GetInt32())).c_str();
             } else if (TypeIs(*definition, "S")) {
                 text = vorform("\"%d\"", static_cast<int>(property->GetInt32()));
             } else {

@@ -1,6 +1,8 @@
 // Identifier text: reserved words, escaping, bus ranges and bus indexes.
 #include <charconv>
+#include <cstring>
 #include <string>
+#include <system_error>
 
 #include "Nlw_Verilog.h"
 #include "model/Nlw_Nl.h"
@@ -52,6 +54,27 @@ bool IsSimpleIdentifier(const char* name) {
     return true;
 }
 
+// The common bus bit: a simple identifier with one index, written as the
+// writer writes indexes ("data[3]"). Splitting it and joining it again gives
+// the same text, so it stands as it is.
+bool IsPlainBusBit(const char* name) {
+    size_t i = 0;
+    while (Nlw_Verilog::IsSimpleIdentifierChar(static_cast<unsigned char>(name[i]), i == 0)) ++i;
+    const int type = Nlw_NlBus::GetOutputDelimiterType();
+    if (i == 0 || name[i] != Nlw_NlBus::GetLeftDelimiter(type)) return false;
+    const char* digits = name + i + 1;
+    const char* close = std::strchr(digits, Nlw_NlBus::GetRightDelimiter(type));
+    if (close == nullptr || close[1] != '\0') return false;
+    int32_t value = 0;
+    const std::from_chars_result read = std::from_chars(digits, close, value);
+    if (read.ec != std::errc() || read.ptr != close) return false;
+    char again[16];
+    const std::to_chars_result written = std::to_chars(again, again + sizeof again, value);
+    const size_t length = static_cast<size_t>(close - digits);
+    return static_cast<size_t>(written.ptr - again) == length &&
+           std::memcmp(again, digits, length) == 0;
+}
+
 // Makes buffer "\name " in place, so that earlier results keep reading the
 // buffer; name may itself point into the buffer.
 void AssignEscaped(std::string& buffer, const char* name) {
@@ -101,6 +124,10 @@ const char* Nlw_Verilog::Escape(const char* name, unsigned char isBused) {
             result.assign(name);
         else
             AssignEscaped(result, name);
+        return result.c_str();
+    }
+    if (IsPlainBusBit(name)) {
+        result.assign(name);
         return result.c_str();
     }
     // The base part of a bus-bit name goes to a working buffer of its own;

@@ -11,6 +11,12 @@
 bool Nlw_ICaseLess::operator()(const Port::String& a, const Port::String& b) const {
     return UT_STR::ICompare(a.c_str(), b.c_str()) < 0;
 }
+bool Nlw_ICaseLess::operator()(const char* a, const Port::String& b) const {
+    return UT_STR::ICompare(a, b.c_str()) < 0;
+}
+bool Nlw_ICaseLess::operator()(const Port::String& a, const char* b) const {
+    return UT_STR::ICompare(a.c_str(), b) < 0;
+}
 
 const char* Nlw_Property::ParameterName(const char* propertyName) {
     if (UT_STR::ICompare(propertyName, "INITSTATE") == 0 ||

@@ -44,7 +44,12 @@ private:
 
 // Orders block type names ignoring ASCII case.
 struct Nlw_ICaseLess {
+    // Lookups by plain text build no key: cell properties look their type
+    // up once per instance.
+    using is_transparent = void;
     bool operator()(const Port::String& a, const Port::String& b) const;
+    bool operator()(const char* a, const Port::String& b) const;
+    bool operator()(const Port::String& a, const char* b) const;
 };
 using Nlw_SimPropTable = std::map<Port::String, std::vector<Nlw_Property>*, Nlw_ICaseLess>;
 

@@ -2,6 +2,7 @@
 // limits and unique names per Verilog scope.
 #include "framework/Nlw_Nl_LU.h"
 
+#include <charconv>
 #include <cstdio>
 #include <cstring>
 #include <string_view>
@@ -233,23 +234,38 @@ const Nlw_NlBus* InsideBus(const Nlw_NlPinBus* bus) {
     return inside;
 }
 
-// Members carry their bus's name and their index.
-void FollowPinBus(const Nlw_NlPinBus* bus, bool bridge) {
+// Members carry their bus's name and their index. Most already do, so the
+// name is built in one reused buffer and the member renamed only when it
+// differs.
+void MemberName(std::string& out, const char* base, int64_t index) {
+    const int style = Nlw_NlBus::GetOutputDelimiterType();
+    char digits[24];
+    const std::to_chars_result end = std::to_chars(digits, digits + sizeof digits, index);
+    out.assign(base);
+    out += Nlw_NlBus::GetLeftDelimiter(style);
+    out.append(digits, end.ptr);
+    out += Nlw_NlBus::GetRightDelimiter(style);
+}
+
+template <class Bus, class GetMember>
+void FollowBus(const Bus* bus, bool bridge, GetMember member) {
     const int64_t low = bus->GetMSB(0) < bus->GetLSB(0) ? bus->GetMSB(0) : bus->GetLSB(0);
     const int64_t high = bus->GetMSB(0) < bus->GetLSB(0) ? bus->GetLSB(0) : bus->GetMSB(0);
+    std::string name;
     for (int64_t i = low; i <= high; ++i) {
-        if (Nlw_NlPin* pin = bus->GetPinMember(static_cast<int32_t>(i)))
-            Rename(pin, Nlw_NlMemberName(bus->GetWritableName(), i), bridge);
+        if (auto* object = member(bus, static_cast<int32_t>(i))) {
+            MemberName(name, bus->GetWritableName(), i);
+            Rename(object, name, bridge);
+        }
     }
 }
 
+void FollowPinBus(const Nlw_NlPinBus* bus, bool bridge) {
+    FollowBus(bus, bridge, [](const Nlw_NlPinBus* b, int32_t i) { return b->GetPinMember(i); });
+}
+
 void FollowSignalBus(const Nlw_NlBus* bus, bool bridge) {
-    const int64_t low = bus->GetMSB(0) < bus->GetLSB(0) ? bus->GetMSB(0) : bus->GetLSB(0);
-    const int64_t high = bus->GetMSB(0) < bus->GetLSB(0) ? bus->GetLSB(0) : bus->GetMSB(0);
-    for (int64_t i = low; i <= high; ++i) {
-        if (Nlw_NlSignal* s = bus->GetSignalMember(static_cast<int32_t>(i)))
-            Rename(s, Nlw_NlMemberName(bus->GetWritableName(), i), bridge);
-    }
+    FollowBus(bus, bridge, [](const Nlw_NlBus* b, int32_t i) { return b->GetSignalMember(i); });
 }
 
 }  // namespace
