@@ -2,6 +2,7 @@
 // format.
 #include "Nlw_VerilogLU.h"
 
+#include <cstring>
 #include <string>
 
 #include "Nlw_Verilog.h"
@@ -46,6 +47,8 @@ bool Nlw_VerilogLU::IsLegal(Port::String name, bool isBused) {
         text = base.c_str();
         length = base.size();
     }
+    // Escaped, only a space is illegal.
+    if (writeEscapedNames) return std::memchr(text, ' ', length) == nullptr;
     for (size_t i = 0; i < length; ++i) {
         if (IsIllegalChar(static_cast<unsigned char>(text[i]), i == 0, writeEscapedNames))
             return false;

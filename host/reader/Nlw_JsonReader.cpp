@@ -4,6 +4,7 @@
 #include "reader/Nlw_JsonReader.h"
 
 #include <fcntl.h>
+#include <sys/mman.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -114,12 +115,37 @@ private:
     void Allocate(size_t size) {
         const size_t align = size >= kDonateFrom ? Nlw_NlArena::kChunk : 64;
         const size_t capacity = (size + simdjson::SIMDJSON_PADDING + align - 1) / align * align;
-        char* p = static_cast<char*>(std::aligned_alloc(align, capacity));
-        if (p == nullptr) throw std::bad_alloc();
-        std::memset(p + size, 0, capacity - size);
-        region_ = std::shared_ptr<char>(p, [](char* c) { std::free(c); });
+        region_ = size >= kDonateFrom ? MapPrefaulted(capacity) : nullptr;
+        if (!region_) {
+            char* p = static_cast<char*>(std::aligned_alloc(align, capacity));
+            if (p == nullptr) throw std::bad_alloc();
+            region_ = std::shared_ptr<char>(p, [](char* c) { std::free(c); });
+        }
+        std::memset(region_.get() + size, 0, capacity - size);
         size_ = size;
         capacity_ = capacity;
+    }
+
+    // A large text's pages are made in one call rather than one fault at a
+    // time as the read fills them, which costs about half as much. Aligned
+    // to the model's chunks; null when the system refuses.
+    static std::shared_ptr<char> MapPrefaulted(size_t capacity) {
+#ifdef MAP_POPULATE
+        const size_t slack = Nlw_NlArena::kChunk;
+        void* m = ::mmap(nullptr, capacity + slack, PROT_READ | PROT_WRITE,
+                         MAP_PRIVATE | MAP_ANONYMOUS | MAP_POPULATE, -1, 0);
+        if (m == MAP_FAILED) return nullptr;
+        char* base = static_cast<char*>(m);
+        const uintptr_t at = reinterpret_cast<uintptr_t>(base);
+        const size_t pad = (slack - at % slack) % slack;
+        // The slack not needed for the alignment is given back.
+        if (pad) ::munmap(base, pad);
+        if (slack - pad) ::munmap(base + pad + capacity, slack - pad);
+        return std::shared_ptr<char>(base + pad, [capacity](char* c) { ::munmap(c, capacity); });
+#else
+        (void)capacity;
+        return nullptr;
+#endif
     }
 
     bool Read(int fd, std::string& reason) {

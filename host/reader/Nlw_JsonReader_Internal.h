@@ -315,8 +315,10 @@ void SplitModules(Design& d);
 // the one being read (Nlw_JsonReader_ParseAhead.cpp).
 class ParseAhead {
 public:
-    // order: the modules to be opened, in the order they will be.
-    ParseAhead(Design& d, const std::vector<uint32_t>& order);
+    // order: the modules to be opened, in the order they will be. With
+    // share, the caller does little with each module: it parses every other
+    // module itself while the thread parses the rest.
+    ParseAhead(Design& d, const std::vector<uint32_t>& order, bool share = false);
     ~ParseAhead();
     ParseAhead(const ParseAhead&) = delete;
     ParseAhead& operator=(const ParseAhead&) = delete;
@@ -337,7 +339,8 @@ private:
     std::vector<uint32_t> order_;
     std::vector<std::pair<size_t, size_t>> ranges_;  // of the text, per module of the order
     Slot slots_[2];
-    size_t parsed_ = 0;    // modules of the order parsed
+    bool share_;
+    size_t parsed_ = 0;    // modules of the order parsed (by the thread)
     size_t released_ = 0;  // modules of the order done with
     bool stop_ = false;
     std::mutex mutex_;

@@ -394,17 +394,18 @@ void ReadModuleListOnce(Design& d) {
     for (uint32_t i = 0; i < d.modules.size(); ++i)
         if (!d.moduleIndex.emplace(d.modules[i].name, i).second) {
             // A fault of the text anywhere is reported first.
-            ParseAhead check(d, all);
+            ParseAhead check(d, all, true);
             for (size_t k = 0; k < all.size(); ++k) check.Open(k);
             Fail("module '" + std::string(d.modules[i].name) + "' is defined twice");
         }
     if (d.modules.empty()) Fail("no modules");
-    // Each module is parsed once here and once more when it is digested.
+    // Each module is parsed once here and once more when it is digested;
+    // here, both threads parse.
     // The first fault of a module's content is reported only when every
     // module has been parsed, so that a fault of the text comes first.
     std::vector<uint32_t> stamp(d.modules.size(), 0);
     std::optional<ReadError> first;
-    ParseAhead ahead(d, all);
+    ParseAhead ahead(d, all, true);
     for (uint32_t i = 0; i < d.modules.size(); ++i) {
         Module& m = d.modules[i];
         ahead.Open(i);

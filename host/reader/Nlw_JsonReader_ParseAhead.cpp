@@ -7,7 +7,8 @@
 
 namespace nlw_json {
 
-ParseAhead::ParseAhead(Design& d, const std::vector<uint32_t>& order) : d_(d), order_(order) {
+ParseAhead::ParseAhead(Design& d, const std::vector<uint32_t>& order, bool share)
+    : d_(d), order_(order), share_(share) {
     // The thread reads the places only: the modules themselves change.
     ranges_.reserve(order_.size());
     for (uint32_t i : order_) ranges_.emplace_back(d.modules[i].textBegin, d.modules[i].textEnd);
@@ -35,7 +36,10 @@ void ParseAhead::Parse(size_t k) {
 }
 
 void ParseAhead::Run() {
-    for (size_t k = 0; k < order_.size(); ++k) {
+    // Shared, the thread takes the even places and slot 0; the caller the
+    // odd places and slot 1.
+    const size_t step = share_ ? 2 : 1;
+    for (size_t k = 0; k < order_.size(); k += step) {
         {
             // Slot k % 2 is free once module k - 2 is let go.
             std::unique_lock<std::mutex> lock(mutex_);
@@ -54,6 +58,13 @@ void ParseAhead::Run() {
 void ParseAhead::Open(size_t k) {
     Module& m = d_.modules[order_[k]];
     if (!thread_.joinable()) {
+        Parse(k);
+    } else if (share_ && k % 2 == 1) {
+        {
+            std::lock_guard<std::mutex> lock(mutex_);
+            released_ = k;  // the thread may go on to k + 1 meanwhile
+        }
+        changed_.notify_all();
         Parse(k);
     } else {
         std::unique_lock<std::mutex> lock(mutex_);
