@@ -160,4 +160,14 @@ private:
     std::string line_;
     std::string alias_;
     DARRAY_Util_INT32 tuple_;
+
+    // Escaped pin names of the last types written, by the name's address:
+    // instances of a type share their pins' names, and names stay put while
+    // the netlist is written.
+    struct PinNameText {
+        const char* name = nullptr;
+        std::string text;
+    };
+    PinNameText pinNames_[256];
+    const std::string& EscapedPinName(const char* name);
 };

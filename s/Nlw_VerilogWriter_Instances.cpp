@@ -34,6 +34,8 @@ void Nlw_VerilogWriter::AppendBitLiteral(std::string& out, int value) {
 void Nlw_VerilogWriter::WriteComponentInstantiationStatements(Nlw_NlBlock* block) {
     Nlw_NetlistWriter* nlw = GetNlw();
     const bool defparamMode = Port_Env::GetEnv("NLW_VERILOG_DEFPARM") != nullptr;
+    // Pin name texts are kept while one module's instances are written.
+    for (PinNameText& slot : pinNames_) slot.name = nullptr;
 
     for (Nlw_NlBlock* child : block->GetChildren()) {
         if (!child || !nlw->IsInstantiatable(child)) continue;
@@ -46,7 +48,7 @@ void Nlw_VerilogWriter::WriteComponentInstantiationStatements(Nlw_NlBlock* block
 
         line_ = nlw->Escape(child->GetTypeName(), 0);
         line_ += ' ';
-        WriteI(line_.c_str());
+        WriteIText(line_);
 
         if (!defparamMode) WriteInlineParamStatements(child);
         line_ = nlw->Escape(child->GetInstanceName(), 0);
@@ -75,7 +77,7 @@ void Nlw_VerilogWriter::WriteComponentInstantiationStatements(Nlw_NlBlock* block
                 if (i + 1 < length)
                     WriteIL(line_.c_str());
                 else
-                    WriteI(line_.c_str());
+                    WriteIText(line_);
                 ++connections;
             }
         }
@@ -102,11 +104,22 @@ void Nlw_VerilogWriter::ApplyBigEndingOrder(Nlw_NlBlock* instance) {
     }
 }
 
+const std::string& Nlw_VerilogWriter::EscapedPinName(const char* name) {
+    // Names lie a few bytes apart: the address is mixed before it is cut.
+    const uint64_t mixed = uint64_t(reinterpret_cast<uintptr_t>(name)) * 0x9E3779B97F4A7C15ull;
+    PinNameText& slot = pinNames_[mixed >> 56];
+    if (slot.name != name) {
+        slot.text = GetNlw()->Escape(name, 0);
+        slot.name = name;
+    }
+    return slot.text;
+}
+
 void Nlw_VerilogWriter::WritePortMaps(Nlw_NlBlock* instance, int written) {
     Nlw_NetlistWriter* nlw = GetNlw();
     int count = written;
     auto separator = [&]() {
-        if (count++ > 0) WriteL(",");
+        if (count++ > 0) WriteText(",\n", 2);
     };
 
     for (Nlw_NlPin& pin : instance->GetPins()) {
@@ -114,19 +127,19 @@ void Nlw_VerilogWriter::WritePortMaps(Nlw_NlBlock* instance, int written) {
         if (Nlw_NlSignal* signal = pin.GetSignal()) {
             separator();
             line_ = '.';
-            line_ += nlw->Escape(pin.GetWritableName(), 0);
+            line_ += EscapedPinName(pin.GetWritableName());
             line_ += '(';
             line_ += nlw->Escape(signal->GetWritableName(), signal->IsBused() ? 1 : 0);
             line_ += ')';
-            WriteI(line_.c_str());
+            WriteIText(line_);
         } else if (Vdm_Property* tie = TieOff(&pin)) {
             separator();
             line_ = '.';
-            line_ += nlw->Escape(pin.GetWritableName(), 0);
+            line_ += EscapedPinName(pin.GetWritableName());
             line_ += '(';
             AppendBitLiteral(line_, tie->GetInt32());
             line_ += ')';
-            WriteI(line_.c_str());
+            WriteIText(line_);
         }
     }
 
@@ -175,7 +188,7 @@ void Nlw_VerilogWriter::WritePortMaps(Nlw_NlBlock* instance, int written) {
                 first = true;
             }
             line_ += first ? "()" : "})";
-            WriteI(line_.c_str());
+            WriteIText(line_);
         }
     }
 

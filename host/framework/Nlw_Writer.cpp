@@ -240,6 +240,11 @@ void Nlw_Writer::WriteText(const char* text, size_t len) {
     Append(text, len);
 }
 
+void Nlw_Writer::WriteIText(const std::string& text) {
+    AppendIndent();
+    Append(text.data(), text.size());
+}
+
 Nlw_Params* Nlw_Writer::GetParams() const {
     return nlw_ ? nlw_->GetParams() : nullptr;
 }

@@ -78,6 +78,7 @@ public:
     void WriteI(const char* text);                 // indentation and text
     void Write(const char* text, int, int);        // text alone
     void WriteText(const char* text, size_t len);  // len characters of text
+    void WriteIText(const std::string& text);      // indentation and text
     void UpIndent() { ++indent_; }
     void DownIndent() {
         if (indent_ > 0) --indent_;

@@ -2,7 +2,6 @@
 // reader uses, and their connections checked against the pins of their types.
 #include <cstring>
 #include <string>
-#include <unordered_set>
 
 #include "reader/Nlw_JsonReader_Internal.h"
 
@@ -142,10 +141,11 @@ void ResolveType(Design& d, std::string_view name, TypeCache& cache, Cell& c) {
 void ReadCells(Design& d, Module& m, object cells) {
     Where where{m.name, {}, {}, {}};
     TypeCache cache;
-    std::unordered_set<std::string_view> cellNames;
+    NameSet& cellNames = d.scratch.cellNames;
     // Room for a typical cell's connections and parameters; what is left
     // over is given back when the module is digested.
     const size_t n = cells.size();
+    cellNames.Reset(n);
     m.cells.reserve(m.cells.size() + n);
     m.conns.reserve(m.conns.size() + 4 * n);
     m.refs.reserve(m.refs.size() + 4 * n);
@@ -183,7 +183,7 @@ void ReadCells(Design& d, Module& m, object cells) {
         if (!haveType) Fail(where.Text() + ": missing or bad \"type\"");
         Cell c;
         c.name = d.pool.Keep(PublicName(kv.key));
-        if (!cellNames.insert(c.name).second) Fail(where.Text() + ": given twice");
+        if (!cellNames.Insert(c.name)) Fail(where.Text() + ": given twice");
         ResolveType(d, PublicName(typeName), cache, c);
         // A leaf's type is its library type until its layout is known.
         const uint32_t base = c.type;
