@@ -3,6 +3,7 @@
 #include <cstring>
 #include <string>
 #include <system_error>
+#include <typeinfo>
 
 #include "Nlw_Verilog.h"
 #include "model/Nlw_Nl.h"
@@ -126,7 +127,8 @@ const char* Nlw_Verilog::Escape(const char* name, unsigned char isBused) {
             AssignEscaped(result, name);
         return result.c_str();
     }
-    if (IsPlainBusBit(name)) {
+    // A class of its own may write indexes its own way: it is asked.
+    if (typeid(*this) == typeid(Nlw_Verilog) && IsPlainBusBit(name)) {
         result.assign(name);
         return result.c_str();
     }

@@ -117,31 +117,12 @@ private:
     void Allocate(size_t size) {
         const size_t align = size >= kDonateFrom ? Nlw_NlArena::kChunk : 64;
         const size_t capacity = (size + simdjson::SIMDJSON_PADDING + align - 1) / align * align;
-        region_ = size >= kDonateFrom ? MapAligned(capacity) : nullptr;
-        if (!region_) {
-            char* p = static_cast<char*>(std::aligned_alloc(align, capacity));
-            if (p == nullptr) throw std::bad_alloc();
-            region_ = std::shared_ptr<char>(p, [](char* c) { std::free(c); });
-        }
+        char* p = static_cast<char*>(std::aligned_alloc(align, capacity));
+        if (p == nullptr) throw std::bad_alloc();
+        region_ = std::shared_ptr<char>(p, [](char* c) { std::free(c); });
         std::memset(region_.get() + size, 0, capacity - size);
         size_ = size;
         capacity_ = capacity;
-    }
-
-    // Pages of its own for a large text, aligned to the model's chunks; null
-    // when the system refuses.
-    static std::shared_ptr<char> MapAligned(size_t capacity) {
-        const size_t slack = Nlw_NlArena::kChunk;
-        void* m = ::mmap(nullptr, capacity + slack, PROT_READ | PROT_WRITE,
-                         MAP_PRIVATE | MAP_ANONYMOUS, -1, 0);
-        if (m == MAP_FAILED) return nullptr;
-        char* base = static_cast<char*>(m);
-        const uintptr_t at = reinterpret_cast<uintptr_t>(base);
-        const size_t pad = (slack - at % slack) % slack;
-        // The slack not needed for the alignment is given back.
-        if (pad) ::munmap(base, pad);
-        if (slack - pad) ::munmap(base + pad + capacity, slack - pad);
-        return std::shared_ptr<char>(base + pad, [capacity](char* c) { ::munmap(c, capacity); });
     }
 
     static constexpr int kShort = -1;

@@ -34,6 +34,9 @@ TEST_F(VerilogText, EscapesExactlyTheNamesThatAreNoSimpleIdentifiers) {
         {"module", false, "module"},
         {"data[7]", false, "\\data[7] "},
         {"data[7]", true, "data[7]"},
+        {"data[07]", true, "data[7]"},
+        {"d[-2]", true, "d[-2]"},
+        {"d[2147483648]", true, "\\d[2147483648] "},
         {"a-b[3]", true, "\\a-b [3]"},
         {"a-b[", true, "\\a-b[ "},
         {longName, false, longName},  // long names survive whole
@@ -81,6 +84,7 @@ TEST_F(VerilogText, EscapeAsksThroughTheVirtualOperations) {
     const char* keep = "keep me";
     EXPECT_EQ(marked.Escape(keep, 0), keep);
     EXPECT_STREQ(marked.Escape("a-b[3]", 1), "\\a-b <i>");
+    EXPECT_STREQ(marked.Escape("ab[3]", 1), "ab<i>");
 }
 
 TEST_F(VerilogText, WritesBusRangesInTheBusOrder) {

@@ -38,4 +38,21 @@ TEST(JsonReaderLayout, EveryLayoutLoadsTheSameModel) {
         << bad.errors[0];
 }
 
+// A large file is read in two halves at once: the modules after the middle
+// must arrive whole. Blanks before them put them in the second half.
+TEST(JsonReaderLayout, LargeFileReadInHalvesLoadsWhole) {
+    Installation inst{DataFiles{{"cells.dat", TestCells()}}};
+    const std::string base = nlwtest::Data("json/hierarchy.json");
+    const size_t open = base.find('{');
+    std::string big = base.substr(0, open + 1);
+    big += "\"creator\": \"blanks\",";
+    big.append(70u << 20, ' ');
+    big += base.substr(open + 1);
+    nlwtest::TempDir dir;
+    const std::string path = dir.File("big.json", big);
+    Loaded got = LoadFile(path);
+    ASSERT_TRUE(got.ok) << (got.errors.empty() ? "" : got.errors[0]);
+    EXPECT_EQ(Text(got), Text(LoadText(base)));
+}
+
 }  // namespace
