@@ -7,10 +7,11 @@
 # flow's netlist (single-bit nets below the top) and for the one of
 # rtl2json -keepbuses, and stops if a netlist's outputs differ from the RTL's.
 #
-# Usage: bench/sim_ratio.sh [BUILD_DIR] [CYCLES] [INSTALLATION] [PARAMS]
+# Usage: bench/sim_ratio.sh [BUILD_DIR] [CYCLES] [INSTALLATION] [FLOW_OPTIONS]
 #   INSTALLATION: another installation's models (VORNIX), to compare model
 #   versions; the default is the tree's share/.
-#   PARAMS: the design's parameters, as "W=32 NREG=16" (default "W=8").
+#   FLOW_OPTIONS: rtl2json options, as "-P W=32 -P NREG=16 -lut 4" (default
+#   "-P W=8"); the RTL gets the same parameters.
 set -euo pipefail
 
 here="$(cd "$(dirname "${BASH_SOURCE[0]}")" && pwd)"
@@ -18,9 +19,11 @@ src="$(cd "$here/.." && pwd)"
 build="${1:-build}"
 cycles="${2:-20000}"
 models="${3:-$src/share}"
-read -r -a params <<<"${4:-W=8}"
-flow_params=()
-for p in "${params[@]}"; do flow_params+=(-P "$p"); done
+read -r -a flow_options <<<"${4:--P W=8}"
+params=()
+for i in "${!flow_options[@]}"; do
+    [ "${flow_options[i]}" = -P ] && params+=("${flow_options[i + 1]}")
+done
 out="$(mktemp -d)"
 trap 'rm -rf "$out"' EXIT
 
@@ -28,8 +31,8 @@ trap 'rm -rf "$out"' EXIT
 design="$src/tests/data/designs/cpu_bus.v"
 lib="$src/tests/tools/lib"
 
-"$src/flow/rtl2json" "${flow_params[@]}" cpu_bus "$out/cpu.json" "$design" >/dev/null
-"$src/flow/rtl2json" -keepbuses "${flow_params[@]}" cpu_bus "$out/buses.json" "$design" >/dev/null
+"$src/flow/rtl2json" "${flow_options[@]}" cpu_bus "$out/cpu.json" "$design" >/dev/null
+"$src/flow/rtl2json" -keepbuses "${flow_options[@]}" cpu_bus "$out/buses.json" "$design" >/dev/null
 python3 "$lib/make_tb.py" "$out/cpu.json" cpu_bus "$cycles" 1 >"$out/tb.v"
 python3 "$lib/make_tb.py" "$out/cpu.json" cpu_bus "$cycles" 1 "${params[@]}" >"$out/rtl_tb.v"
 iverilog -g2005 -o "$out/rtl.vvp" -s nlw_tb "$out/rtl_tb.v" "$design"
@@ -55,6 +58,6 @@ for n in cpu buses; do
     python3 "$lib/compare_sim.py" "$out/rtl.log" "$out/log.1" >/dev/null ||
         { echo "sim_ratio.sh: the $n netlist's outputs differ from the RTL's" >&2; exit 1; }
     printf 'cpu_bus %s%s, %s cells, %s cycles: RTL %s s, gate level %s s, ratio %s\n' \
-        "${params[*]}" "$([ $n = buses ] && echo ' -keepbuses' || true)" "$cells" "$cycles" "$rtl" "$net" \
+        "${flow_options[*]}" "$([ $n = buses ] && echo ' -keepbuses' || true)" "$cells" "$cycles" "$rtl" "$net" \
         "$(awk -v r="$rtl" -v n="$net" 'BEGIN { printf "%.1f", (r > 0) ? n / r : 0 }')"
 done
