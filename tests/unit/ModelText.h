@@ -11,6 +11,18 @@
 
 namespace nlwtest {
 
+// A new property of a case table's kind (bits, int, float, bool, list,
+// typedef, else a string) and value text.
+inline Vdm_Property* NewProperty(const std::string& kind, const char* name, const std::string& v) {
+    if (kind == "bits") return Vdm_Property::NewBits(name, v.c_str());
+    if (kind == "int") return Vdm_Property::NewInt(name, std::stoi(v));
+    if (kind == "float") return Vdm_Property::NewFloat(name, std::stod(v));
+    if (kind == "bool") return Vdm_Property::NewBool(name, v == "1");
+    if (kind == "list") return Vdm_Property::NewList(name);
+    if (kind == "typedef") return Vdm_Property::NewTypeDef(name, {v});
+    return Vdm_Property::NewString(name, v.c_str());
+}
+
 inline std::string PropertyText(const Vdm_PropertyHolder& h) {
     std::string out;
     if (!h.GetProperties()) return out;

@@ -94,6 +94,49 @@ inline std::string Data(const std::string& rel) {
     return ReadFile(std::string(NLW_TEST_DATA_DIR) + "/" + rel);
 }
 
+// The cases of a table tests/data/tables/<name>.txt, one a line: fields
+// split at '|', blanks around them dropped; '#' lines and empty lines are
+// skipped. In a field \n, \r, \t, \s (a blank), \| and \\ stand for those
+// characters; Opt() reads a lone "-" as no value.
+using Row = std::vector<std::string>;
+inline std::vector<Row> Table(const std::string& name) {
+    std::vector<Row> rows;
+    std::istringstream in(Data("tables/" + name + ".txt"));
+    for (std::string line; std::getline(in, line);) {
+        if (line.empty() || line[0] == '#') continue;
+        Row row;
+        std::string field;
+        size_t blanks = 0;  // trailing blanks of the field so far
+        auto end = [&] {
+            field.resize(field.size() - blanks);
+            row.push_back(field);
+            field.clear();
+            blanks = 0;
+        };
+        for (size_t i = 0; i < line.size(); ++i) {
+            const char c = line[i];
+            if (c == '|') {
+                end();
+            } else if (c == ' ') {
+                if (!field.empty()) field += c, ++blanks;
+            } else if (c == '\\' && i + 1 < line.size()) {
+                const char e = line[++i];
+                field += e == 'n' ? '\n' : e == 'r' ? '\r' : e == 't' ? '\t' : e == 's' ? ' ' : e;
+                blanks = 0;
+            } else {
+                field += c, blanks = 0;
+            }
+        }
+        end();
+        rows.push_back(row);
+    }
+    EXPECT_FALSE(rows.empty()) << "no cases in table " << name;
+    return rows;
+}
+inline const char* Opt(const std::string& field) {
+    return field == "-" ? nullptr : field.c_str();
+}
+
 // text with every from replaced by to: keeps run-dependent parts (versions,
 // temporary paths) out of golden files.
 inline std::string Replaced(std::string text, const std::string& from, const std::string& to) {
@@ -108,6 +151,24 @@ inline std::string Joined(const std::vector<std::string>& lines) {
     std::string text;
     for (const std::string& line : lines) text += line + "\n";
     return text;
+}
+
+// Items as one text, each in <>, so that empty items and an empty list show.
+inline std::string Bracketed(const std::vector<std::string>& items) {
+    std::string text;
+    for (const std::string& item : items) text += "<" + item + ">";
+    return text;
+}
+
+// The items of a Bracketed text.
+inline std::vector<std::string> Unbracketed(const std::string& text) {
+    std::vector<std::string> items;
+    for (size_t open = text.find('<'); open != std::string::npos; open = text.find('<', open)) {
+        const size_t close = text.find('>', open);
+        items.push_back(text.substr(open + 1, close - open - 1));
+        open = close;
+    }
+    return items;
 }
 
 // Compares text with the golden file tests/data/golden/<name>.txt. With

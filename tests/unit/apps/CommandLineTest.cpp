@@ -4,6 +4,7 @@
 #include <vector>
 
 #include "Nlw_CommandLine.h"
+#include "TestFiles.h"
 
 namespace {
 
@@ -75,25 +76,9 @@ TEST(CommandLine, TesselHostOptions) {
 }
 
 TEST(CommandLine, UnusableCommandLines) {
-    struct Case {
-        Nlw_Program program;
-        std::vector<std::string> args;
-    };
-    const Case cases[] = {
-        {Nlw_Program::Qdb2ver, {}},                                  // no input file
-        {Nlw_Program::Qdb2ver, {"-bogus", "a.json"}},                // unknown option
-        {Nlw_Program::Qdb2ver, {"a.json", "-ti"}},                   // missing value
-        {Nlw_Program::Qdb2ver, {"-insert_chipwide", "maybe", "a"}},  // bad value
-        {Nlw_Program::Qdb2ver, {"-sim", "a.json"}},                  // a tessel option
-        {Nlw_Program::Tessel, {"-ofmt", "vhdl", "a.json"}},
-        {Nlw_Program::Tessel, {"-intstyle", "loud", "a.json"}},
-        {Nlw_Program::Tessel, {"-insert_pp_buffers", "yes", "a.json"}},
-        {Nlw_Program::Tessel, {"-s", "-", "a.json"}},
-        {Nlw_Program::Tessel, {"a.json", "b.v", "c"}},  // one word too many
-    };
-    for (const Case& c : cases) {
-        Nlw_CommandLine cl = Parse(c.program, c.args);
-        EXPECT_NE(cl.error, "") << ::testing::PrintToString(c.args);
+    for (const nlwtest::Row& c : nlwtest::Table("bad_command_lines")) {
+        const Nlw_Program program = c[0] == "tessel" ? Nlw_Program::Tessel : Nlw_Program::Qdb2ver;
+        EXPECT_NE(Parse(program, nlwtest::Unbracketed(c[1])).error, "") << c[0] << " " << c[1];
     }
 }
 

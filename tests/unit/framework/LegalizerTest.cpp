@@ -144,28 +144,10 @@ TEST_F(Legalizer, VisitsTypesThenEachMacrosNamesInWalkOrder) {
 }
 
 TEST_F(Legalizer, EscapesOrRenamesKeywords) {
-    struct Case {
-        bool cache, escaped;
-        Names names;  // instances, signals, signal buses, the module type
-    };
-    const Case cases[] = {
-        {true,
-         true,
-         {"\\signed ", "Wire", "\\module ", "\\bool ", "\\wire ", "\\logic [0]", "uwire_x",
-          "\\logic ", "\\generate "}},
-        {true,
-         false,
-         {"signed_1", "Wire", "\\module ", "bool_1", "wire_1", "logic_1[0]", "uwire_x", "logic_1",
-          "generate_1"}},
-        // Without a keyword cache keywords are left alone.
-        {false,
-         false,
-         {"signed", "Wire", "\\module ", "bool", "wire", "logic[0]", "uwire_x", "logic",
-          "generate"}},
-    };
     static const char* table[] = {"wire", "module", nullptr};
-    for (const Case& c : cases) {
-        SCOPED_TRACE(::testing::Message() << "cache " << c.cache << " escaped " << c.escaped);
+    for (const nlwtest::Row& c : nlwtest::Table("keywords")) {
+        const bool cache = c[0] == "1";
+        SCOPED_TRACE(::testing::Message() << "cache " << c[0] << " escaped " << c[1]);
         Nlw_Nl_SpkCache::Clear();
         Design d;
         Nlw_NlType* gen = d.b.AddModuleType("generate");
@@ -175,16 +157,16 @@ TEST_F(Legalizer, EscapesOrRenamesKeywords) {
         d.b.GetSignalBusMember(d.b.AddSignalBus(d.top, "logic", 0, 0), 0);
         d.b.AddSignal(d.top, "uwire_x");
 
-        if (c.cache) Nlw_Nl_SpkCache::MakeSpkCache(table, true);
+        if (cache) Nlw_Nl_SpkCache::MakeSpkCache(table, true);
         // A second run finds nothing more to change.
         for (int run = 0; run < 2; ++run) {
-            DashLU(&d.view, c.escaped).Process();
+            DashLU(&d.view, c[1] == "1").Process();
             Names names = Instances(d.top);
             for (const Names& more : {Signals(d.top), SignalBuses(d.top), Names{gen->GetName()}})
                 names.insert(names.end(), more.begin(), more.end());
-            EXPECT_EQ(names, c.names);
+            EXPECT_EQ(nlwtest::Bracketed(names), c[2]);
         }
-        if (c.cache) {
+        if (cache) {
             EXPECT_STREQ(d.top->GetChildren()[0]->GetAka(), "signed");
         }
     }
@@ -211,24 +193,12 @@ TEST_F(Legalizer, KeepsTheCachesWordsUntilRebuilt) {
 }
 
 TEST_F(Legalizer, MakesInstanceNamesUniqueGivingTheLaterOneASuffix) {
-    struct Case {
-        const char* what;
-        Names instances, expected;
-    };
-    const Case cases[] = {
-        {"collide after legalizing", {"a_b", "a-b"}, {"a_b", "a_b_1"}},
-        {"later object yields", {"a-b", "a_b"}, {"a_b", "a_b_1"}},
-        {"smallest free suffix", {"x", "x", "x_1", "x"}, {"x", "x_1", "x_1_1", "x_2"}},
-        {"case matters", {"A", "a"}, {"A", "a"}},
-        {"escaped equals plain", {"\\x ", "x"}, {"\\x ", "x_1"}},
-        {"plain equals escaped", {"x", "\\x "}, {"x", "\\x_1 "}},
-        {"suffix already taken", {"n_1", "n", "n"}, {"n_1", "n", "n_2"}},
-    };
-    for (const Case& c : cases) {
+    for (const nlwtest::Row& c : nlwtest::Table("unique_instances")) {
         Design d;
-        for (const std::string& name : c.instances) d.b.CreateLeaf(d.top, d.cell, name.c_str());
+        for (const std::string& name : nlwtest::Unbracketed(c[0]))
+            d.b.CreateLeaf(d.top, d.cell, name.c_str());
         DashLU(&d.view, true).Process();
-        EXPECT_EQ(Instances(d.top), c.expected) << c.what;
+        EXPECT_EQ(nlwtest::Bracketed(Instances(d.top)), c[1]) << c[0];
     }
 }
 

@@ -28,22 +28,11 @@ std::vector<std::string> Dump(const Nlw_NetlistWriter& nlw) {
 }
 
 TEST(NetlistWriter, PadOrTrimKeepsLeastSignificantDigits) {
-    struct Case {
-        size_t count;
-        const char* text;
-        const char* fill;
-        const char* result;
-    };
-    const Case cases[] = {
-        {3, "AB", "0", "0AB"}, {3, "ABC", "0", "ABC"},   {3, "ABCDE", "0", "CDE"},
-        {0, "AB", "0", ""},    {4, "", "0", "0000"},     {5, "1", "xy", "xxxx1"},
-        {3, "7", "", "007"},   {3, "7", nullptr, "007"},
-    };
     StubNetlistWriter nlw;
-    for (const Case& c : cases) {
-        Port::String text(c.text);
-        nlw.PadOrTrim(c.count, text, c.fill);
-        EXPECT_STREQ(text.c_str(), c.result) << c.count << " " << c.text;
+    for (const nlwtest::Row& c : nlwtest::Table("pad_or_trim")) {
+        Port::String text(c[1].c_str());
+        nlw.PadOrTrim(std::stoul(c[0]), text, nlwtest::Opt(c[2]));
+        EXPECT_EQ(text.str(), c[3]) << c[0] << " " << c[1];
     }
 }
 
@@ -76,25 +65,15 @@ TEST(NetlistWriter, LoadsTheSimulatablePropertyTable) {
 
 TEST(NetlistWriter, BadOrMissingTableChangesNothing) {
     TempDir dir;
-    struct Case {
-        const char* content;
-        int line;
-    };
-    const Case cases[] = {
-        {"A P I 1\nA P I\n", 2},    // a field missing
-        {"A P I 1 extra\n", 1},     // a field too many
-        {"\n# c\nA P HEX 0\n", 3},  // unknown type
-    };
-    for (const Case& c : cases) {
-        WriteFile(dir / "bad.tbl", c.content);
+    for (const nlwtest::Row& c : nlwtest::Table("bad_sim_tables")) {
+        WriteFile(dir / "bad.tbl", c[0]);
         StubNetlistWriter nlw;
         nlw.AddSimProperty("KEEP", "P", "I", "0");
         QuietCapture capture;
-        EXPECT_FALSE(nlw.LoadSimPropTable((dir / "bad.tbl").c_str())) << c.content;
+        EXPECT_FALSE(nlw.LoadSimPropTable((dir / "bad.tbl").c_str())) << c[0];
         std::vector<std::string> errors = capture.Texts(Port_MsgLevel::Error);
-        ASSERT_EQ(errors.size(), 1u) << c.content;
-        EXPECT_NE(errors[0].find("line " + std::to_string(c.line) + " "), std::string::npos)
-            << errors[0];
+        ASSERT_EQ(errors.size(), 1u) << c[0];
+        EXPECT_NE(errors[0].find("line " + c[1] + " "), std::string::npos) << errors[0];
         EXPECT_NE(errors[0].find(dir / "bad.tbl"), std::string::npos) << errors[0];
         EXPECT_EQ(Dump(nlw), std::vector<std::string>{"KEEP:P:I:0"});
     }

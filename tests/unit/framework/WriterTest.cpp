@@ -339,40 +339,23 @@ TEST(WriterRun, PlacementFailureNamesItsReason) {
 }
 
 TEST(FileSafety, ModuleFileNamesAreSafeAndUniqueIgnoringCase) {
-    const std::vector<std::string> names = {"top",   "../../escaped",      "a b/c", "esc$x ", "Top",
-                                            "top",   "chipwide",           "-opt",  "CON",    "",
-                                            "top_2", std::string(300, 'x')};
-    const std::vector<std::string> expected = {
-        "top",        "______escaped", "a_b_c", "esc_x_", "Top_2",   "top",
-        "chipwide_2", "_-opt",         "CON_",  "_",      "top_2_2", std::string(120, 'x')};
+    std::vector<std::string> names, expected;
+    for (const nlwtest::Row& c : nlwtest::Table("safe_file_names"))
+        names.push_back(c[0]), expected.push_back(c[1]);
+    names.push_back(std::string(300, 'x')), expected.push_back(std::string(120, 'x'));
     EXPECT_EQ(Nlw_FileSafety::SafeFileNames(names, {"CHIPWIDE", "net_ism"}), expected);
 }
 
 TEST(PropOutFilter, NamesAndPatternsIgnoringCaseFromAReadableFile) {
-    TempDir dir;
-    WriteFile(dir / "vdm2ver.pfd",
-              "# properties kept out of the netlist\n"
-              "LOC, RLOC   BEL\n"
-              "\tinit_*  # every init\r\n"
-              "*_PATH\n"
-              "\n");
-    Vdh_PropOutFilter filter((dir / "vdm2ver.pfd").c_str(), nullptr);
+    Vdh_PropOutFilter filter(NLW_TEST_DATA_DIR "/framework/vdm2ver.pfd", nullptr);
     EXPECT_TRUE(filter.IsLoaded());
-    struct Case {
-        const char* name;
-        bool filtered;
-    };
-    const Case cases[] = {
-        {"loc", true},    {"RLOC", true},      {"BEL", true},   {"Init_A", true},
-        {"INIT", false},  {"DATA_PATH", true}, {"PATH", false}, {"LOCX", false},
-        {"every", false}, {"#", false},        {"", false},
-    };
-    for (const Case& c : cases) EXPECT_EQ(filter.IsFiltered(c.name), c.filtered) << c.name;
+    for (const nlwtest::Row& c : nlwtest::Table("prop_out_filter"))
+        EXPECT_EQ(filter.IsFiltered(c[0].c_str()), c[1] == "1") << c[0];
     EXPECT_FALSE(filter.IsFiltered(nullptr));
 
     // An unreadable file is warned about and filters nothing.
     QuietCapture capture;
-    Vdh_PropOutFilter none((dir / "none.pfd").c_str(), nullptr);
+    Vdh_PropOutFilter none("/no/such/none.pfd", nullptr);
     EXPECT_FALSE(none.IsLoaded());
     EXPECT_FALSE(none.IsFiltered("LOC"));
     EXPECT_EQ(capture.Count(Port_MsgLevel::Warning), 1u);

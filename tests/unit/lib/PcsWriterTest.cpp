@@ -81,42 +81,21 @@ TEST_F(PcsWriterTest, PortNetAndInstanceRecords) {
     TopPort("odd", NLW_DIR_UNTYPED);
     top_->FindPin("q")->SetAka("Q_PAD");
     b_.SetVisible(top_->FindPin("hidden"), false);
-    struct NetCase {
-        bool visible;
-        const char* own;      // property on the net, or null
-        const char* network;  // property on its network, or null
-        bool aka;
-    } nets[] = {
-        {true, "USER_VISIBLE", nullptr, true},   {true, "NAME_RECOVERED", nullptr, true},
-        {true, nullptr, "NAME_RECOVERED", true}, {true, nullptr, "USER_VISIBLE", true},
-        {true, "USER_VISIBLE", nullptr, false},  {true, nullptr, nullptr, true},
-        {true, nullptr, "OTHER", true},          {false, "USER_VISIBLE", nullptr, true},
-    };
     int n = 0;
-    for (const NetCase& c : nets) {
+    for (const nlwtest::Row& c : nlwtest::Table("pcs_nets")) {
         Nlw_NlSignal* net = Net("n" + std::to_string(n));
         net->SetWritableName(vorform("n%d_w", n++));
-        if (c.aka) net->SetAka("N_AKA");
-        b_.SetVisible(net, c.visible);
-        if (c.own) net->AddProperty(Vdm_Property::NewInt(c.own, 1));
-        if (c.network) b_.GetOrCreateNetwork(net)->AddProperty(Vdm_Property::NewInt(c.network, 1));
+        if (c[3] == "1") net->SetAka("N_AKA");
+        b_.SetVisible(net, c[0] == "1");
+        if (c[1] != "-") net->AddProperty(Vdm_Property::NewInt(c[1].c_str(), 1));
+        if (c[2] != "-")
+            b_.GetOrCreateNetwork(net)->AddProperty(Vdm_Property::NewInt(c[2].c_str(), 1));
     }
-    struct CellCase {
-        const char* type;
-        const char* aka;
-        bool timcell, instantiatable;
-    } cells[] = {
-        {"V_RAMB16_S36", nullptr, true, true}, {"v_ramb4_s8", "RAM", true, true},
-        {"V_FDDRCPE", nullptr, true, true},    {"v_fddrrse", "DDR", true, true},
-        {"V_FD", nullptr, true, true},         {"V_FD", "FF", true, true},
-        {"V_RAMB4_S4", nullptr, false, true},  {"V_RAMB16_S36", nullptr, true, false},
-        {"V_FDDRRSEX", nullptr, true, true},
-    };
     n = 0;
-    for (const CellCase& c : cells) {
-        Nlw_NlBlock* cell = Cell(Type(c.type, {}, c.timcell), "c" + std::to_string(n++));
-        if (c.aka) cell->SetAka(c.aka);
-        if (!c.instantiatable) cell->AddProperty(Vdm_Property::NewInt("NLW_NOT_INSTANTIATABLE", 1));
+    for (const nlwtest::Row& c : nlwtest::Table("pcs_cells")) {
+        Nlw_NlBlock* cell = Cell(Type(c[0].c_str(), {}, c[2] == "1"), "c" + std::to_string(n++));
+        if (c[1] != "-") cell->SetAka(c[1].c_str());
+        if (c[3] != "1") cell->AddProperty(Vdm_Property::NewInt("NLW_NOT_INSTANTIATABLE", 1));
     }
     Port_MsgCapture capture;
     nlwtest::ExpectGolden("pcs/flat_records", Pcs());

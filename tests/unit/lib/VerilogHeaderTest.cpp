@@ -149,28 +149,13 @@ TEST_F(VerilogHeader, WriteParamsListsTheRun) {
     nlwtest::ExpectGolden("header/write_params_lists_the_run", writer.GetMemoryText());
 }
 
-struct NameCase {
-    const char* output;
-    const char* sdfPath;  // null when none
-    const char* sdf;
-    const char* sdfPrefix;
-    const char* directory;
-};
-
 TEST_F(VerilogHeader, FileNamesDeriveFromTheNetlistName) {
-    const std::vector<NameCase> cases = {
-        {"out/top.v", nullptr, "out/top.sdf", "out/", "out/"},
-        {"out/top.v", "sdf", "sdf/top.sdf", "sdf/", "out/"},
-        {"out/top.v", "", "top.sdf", "", "out/"},
-        {"top.v", nullptr, "top.sdf", "", ""},
-        {"/a/b.c/top.v", "/t", "/t/top.sdf", "/t/", "/a/b.c/"},
-    };
-    for (const NameCase& c : cases) {
-        params_.SetOutputFileName(c.output);
-        params_.SetSdfPath(c.sdfPath);
-        EXPECT_EQ(Peer::SdfFileName(nlw_), c.sdf) << c.output;
-        EXPECT_EQ(Peer::SdfMHPrefix(nlw_), c.sdfPrefix) << c.output;
-        EXPECT_EQ(Peer::Directory(nlw_), c.directory) << c.output;
+    for (const nlwtest::Row& c : nlwtest::Table("file_names")) {
+        params_.SetOutputFileName(c[0].c_str());
+        params_.SetSdfPath(nlwtest::Opt(c[1]));
+        EXPECT_EQ(Peer::SdfFileName(nlw_), c[2]) << c[0];
+        EXPECT_EQ(Peer::SdfMHPrefix(nlw_), c[3]) << c[0];
+        EXPECT_EQ(Peer::Directory(nlw_), c[4]) << c[0];
     }
 
     params_.SetOutputFileName("out/top.v");

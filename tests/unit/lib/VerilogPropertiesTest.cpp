@@ -2,11 +2,11 @@
 // simulation library's parameter definitions and turned into Verilog values.
 #include <gtest/gtest.h>
 
-#include <functional>
 #include <memory>
 #include <string>
 #include <vector>
 
+#include "ModelText.h"
 #include "Nlw_Verilog.h"
 #include "TestFiles.h"
 #include "model/Nlw_NlBuilder.h"
@@ -59,30 +59,11 @@ protected:
 };
 
 TEST_F(VerilogProperties, ConvertsByTypeCodeAndExpectedType) {
-    const struct {
-        std::function<Vdm_Property*()> make;  // a property named P
-        const char* type;                     // the definition's expected type
-        const char* dflt;
-    } cases[] = {
-        {[] { return Vdm_Property::NewBool("P", false); }, "BL", ""},
-        {[] { return Vdm_Property::NewBool("P", true); }, "S", ""},
-        {[] { return Vdm_Property::NewFloat("P", 2.5); }, "F", ""},
-        {[] { return Vdm_Property::NewFloat("P", 2.5); }, "I", ""},
-        {[] { return Vdm_Property::NewInt("P", -12); }, "I", ""},
-        {[] { return Vdm_Property::NewInt("P", 7); }, "s", ""},
-        {[] { return Vdm_Property::NewInt("P", 7); }, "HV", "16'h0000"},
-        {[] { return Vdm_Property::NewString("P", "hello"); }, "S", ""},
-        {[] { return Vdm_Property::NewString("P", "yes"); }, "BL", ""},
-        {[] { return Vdm_Property::NewString("P", "1.5e-3"); }, "F", ""},
-        {[] { return Vdm_Property::NewString("P", "3"); }, "I", ""},
-        {[] { return Vdm_Property::NewTypeDef("P", {"a"}); }, "S", ""},
-        {[] { return Vdm_Property::NewBits("P", "01"); }, "BV", "2'b00"},
-    };
     std::string text;
-    for (const auto& c : cases) {
-        definitions = {Nlw_Property("P", c.type, c.dflt)};
-        Vdm_Property* p = c.make();
-        text += OfferLine(std::string(p->GetPropertyTypeName()) + " as " + c.type, p);
+    for (const nlwtest::Row& c : nlwtest::Table("sim_conversions")) {
+        definitions = {Nlw_Property("P", c[2].c_str(), c[3].c_str())};
+        Vdm_Property* p = nlwtest::NewProperty(c[0], "P", c[1]);
+        text += OfferLine(std::string(p->GetPropertyTypeName()) + " as " + c[2], p);
     }
     nlwtest::ExpectGolden("properties/conversions", text);
 }
@@ -90,19 +71,11 @@ TEST_F(VerilogProperties, ConvertsByTypeCodeAndExpectedType) {
 // Vectors are sized by the default's width; widths that are no decimal
 // number fall back to the value's own.
 TEST_F(VerilogProperties, SizesVectorsByTheDefaultsWidth) {
-    const struct {
-        const char *type, *dflt, *value;
-    } cases[] = {
-        {"HV", "16'h0000", "ABCD"}, {"HV", "0000", "ABC"},    {"HV", "", "AB"},
-        {"HV", "12'h000", "AB"},    {"HV", "10'h000", "3FF"}, {"HV", "4'h0", "ABCD"},
-        {"BV", "4'b0000", "101"},   {"BV", "2'b00", "1101"},  {"BV", "0", "110"},
-        {"HV", "x'h00", "ABC"},     {"BV", "4b'0", "10"},     {"HV", "0'h0", "A"},
-    };
     std::string text;
-    for (const auto& c : cases) {
-        definitions = {Nlw_Property("P", c.type, c.dflt)};
-        text += OfferLine(std::string(c.type) + " " + c.dflt + " " + c.value,
-                          Vdm_Property::NewString("P", c.value));
+    for (const nlwtest::Row& c : nlwtest::Table("sim_vectors")) {
+        definitions = {Nlw_Property("P", c[0].c_str(), c[1].c_str())};
+        text +=
+            OfferLine(c[0] + " " + c[1] + " " + c[2], Vdm_Property::NewString("P", c[2].c_str()));
     }
     nlwtest::ExpectGolden("properties/vectors", text);
 }

@@ -15,9 +15,7 @@ namespace {
 using vwtest::ScopedEnv;
 using vwtest::TempDir;
 
-const char* const kNoVornix =
-    " The VORNIX environment variable must be set for this program towork. Please check your "
-    "environment to ensure that it is setup properly to use the Vornix tools\n";
+using vwtest::kNoVornix;
 
 class VerilogTestWriter : public vwtest::WriterTest {
 protected:
@@ -63,15 +61,15 @@ protected:
 
     // A global signal of the root with its connection value and floating
     // value.
-    Nlw_NlSignal* Global(const char* name, bool setReset, int conn, int floatVal) {
-        Nlw_NlSignal* s = b_.AddSignal(top_, name);
+    Nlw_NlSignal* Global(Nlw_NlBuilder& b, bool setReset, int conn, int floatVal) {
+        Nlw_NlSignal* s = b.AddSignal(top_, setReset ? "GSR" : "GTS");
         if (setReset)
-            b_.SetSetReset(s);
+            b.SetSetReset(s);
         else
-            b_.SetTristate(s);
+            b.SetTristate(s);
         s->AddProperty(
             Vdm_Property::NewInt(setReset ? "NLW_SETRESET_CONN" : "NLW_TRISTATE_CONN", conn));
-        b_.GetOrCreateNetwork(s)->AddProperty(Vdm_Property::NewInt("VL_FLOATVAL", floatVal));
+        b.GetOrCreateNetwork(s)->AddProperty(Vdm_Property::NewInt("VL_FLOATVAL", floatVal));
         return s;
     }
 
@@ -85,7 +83,7 @@ TEST_F(VerilogTestWriter, WholeFileOfASmallDesign) {
     b_.AddPortBus(top_, "d", NLW_DIR_INPUT, 7, 0);
     b_.AddPort(top_, "q", NLW_DIR_OUTPUT);
     b_.AddPortBus(top_, "cnt", NLW_DIR_OUTPUT, 8, 0);
-    Global("GSR", true, 3, 0);
+    Global(b_, true, 3, 0);
     nlwtest::ExpectGolden("testfixture/small_design",
                           nlwtest::Replaced(File(), chipwide, "<root>/verilog/src/chipwide.v"));
 }
@@ -170,8 +168,8 @@ TEST_F(VerilogTestWriter, InputsAreRegistersAndEverythingElseWires) {
 
 TEST_F(VerilogTestWriter, OnlyGlobalsReachedThroughChipwideGetARegister) {
     Root();
-    Global("GSR", true, 3, 0);
-    Global("GTS", false, 3, 0);
+    Global(b_, true, 3, 0);
+    Global(b_, false, 3, 0);
     nlwtest::ExpectGolden("testfixture/globals_through_chipwide", Fixture());
 
     for (int conn : {0, 1, 2}) {
@@ -226,17 +224,12 @@ TEST_F(VerilogTestWriter, DumpNamesAreEscapedInsideTheirStringLiterals) {
 
 TEST_F(VerilogTestWriter, BusColumnsAreTheHexDigitsOfTheBus) {
     Root();
-    struct Case {
-        int msb, lsb, columns;
-    };
-    const Case cases[] = {{0, 0, 1},  {3, 0, 1},  {4, 1, 1}, {4, 0, 2}, {7, 0, 2},   {8, 0, 3},
-                          {15, 0, 4}, {16, 0, 5}, {9, 2, 2}, {0, 7, 2}, {-1, -9, 3}, {0, 8, 3}};
     int n = 0;
-    for (const Case& c : cases) {
-        const Nlw_NlPinBus* bus =
-            b_.AddPortBus(top_, vorform("b%d", n++), NLW_DIR_INPUT, c.msb, c.lsb);
-        EXPECT_EQ(Nlw_VerilogTestWriter::GetBusColumns(bus), c.columns)
-            << "[" << c.msb << ":" << c.lsb << "]";
+    for (const nlwtest::Row& c : nlwtest::Table("bus_columns")) {
+        const Nlw_NlPinBus* bus = b_.AddPortBus(top_, vorform("b%d", n++), NLW_DIR_INPUT,
+                                                std::stoi(c[0]), std::stoi(c[1]));
+        EXPECT_EQ(Nlw_VerilogTestWriter::GetBusColumns(bus), std::stoi(c[2]))
+            << c[0] << ":" << c[1];
     }
 }
 
@@ -279,30 +272,7 @@ TEST_F(VerilogTestWriter, NamesLongerThanTheGridKeepTheirFirstCharacters) {
 // Stimulus
 
 TEST_F(VerilogTestWriter, StimulusDrivesTheGlobalsByConnection) {
-    struct Global {
-        bool present;
-        int conn, floatVal;
-        bool refPin;
-    };
-    struct Case {
-        const char* name;
-        Global setReset, tristate;
-    };
-    const Global none{false, 0, 0, false};
-    const Case cases[] = {
-        {"none", none, none},
-        {"gsr_chipwide", {true, 3, 0, false}, none},
-        {"gsr_float_high", {true, 3, 1, false}, none},
-        {"gsr_conn1", {true, 1, 0, true}, none},
-        {"gsr_float_minus1", {true, 3, -1, false}, none},
-        {"gsr_port", {true, 0, 1, true}, none},
-        {"gsr_conn2_no_port", {true, 2, 0, false}, none},
-        {"gts_port", none, {true, 2, 1, true}},
-        {"gts_chipwide", none, {true, 3, 0, false}},
-        {"gts_float_minus1", none, {true, 3, -1, false}},
-        {"both", {true, 3, 0, false}, {true, 3, 1, false}},
-    };
-    for (const Case& c : cases) {
+    for (const nlwtest::Row& c : nlwtest::Table("fixture_globals")) {
         Nlw_NlView view;
         Nlw_NlBuilder b(&view);
         top_ = b.CreateRoot(b.AddModuleType("top"), "top");
@@ -310,23 +280,18 @@ TEST_F(VerilogTestWriter, StimulusDrivesTheGlobalsByConnection) {
         Nlw_NlPin* rst = b.AddPort(top_, "rst_n", NLW_DIR_INPUT);
         Nlw_NlPin* ts = b.AddPort(top_, "ts", NLW_DIR_INPUT);
         for (bool setReset : {true, false}) {
-            const Global& g = setReset ? c.setReset : c.tristate;
-            if (!g.present) continue;
-            Nlw_NlSignal* s = b.AddSignal(top_, setReset ? "GSR" : "GTS");
-            if (setReset)
-                b.SetSetReset(s);
-            else
-                b.SetTristate(s);
-            s->AddProperty(
-                Vdm_Property::NewInt(setReset ? "NLW_SETRESET_CONN" : "NLW_TRISTATE_CONN", g.conn));
-            b.GetOrCreateNetwork(s)->AddProperty(Vdm_Property::NewInt("VL_FLOATVAL", g.floatVal));
-            if (g.refPin) {
+            int conn, floatVal, refPin;
+            if (std::sscanf(c[setReset ? 1 : 2].c_str(), "%d, %d, %d", &conn, &floatVal, &refPin) !=
+                3)
+                continue;
+            Nlw_NlSignal* s = Global(b, setReset, conn, floatVal);
+            if (refPin) {
                 Nlw_NlPin* pin = setReset ? rst : ts;
                 b.ConnectChild(pin, s);
                 b.SetRefPin(s, pin);
             }
         }
-        nlwtest::ExpectGolden(std::string("testfixture/stimulus_") + c.name, Stimulus());
+        nlwtest::ExpectGolden("testfixture/stimulus_" + c[0], Stimulus());
     }
 }
 

@@ -5,6 +5,7 @@
 #include <vector>
 
 #include "Nlw_Verilog.h"
+#include "TestFiles.h"
 #include "model/Nlw_NlBuilder.h"
 
 namespace {
@@ -17,34 +18,12 @@ protected:
 };
 
 TEST_F(VerilogText, EscapesExactlyTheNamesThatAreNoSimpleIdentifiers) {
-    struct Case {
-        std::string name;
-        bool isBused;
-        std::string expected;
-    };
+    for (const nlwtest::Row& c : nlwtest::Table("escapes"))
+        EXPECT_EQ(nlw.Escape(c[0].c_str(), c[1] == "1"), c[2]) << c[0] << " " << c[1];
+    // Long names survive whole.
     const std::string longName(5000, 'n'), longStem(4000, 'c');
-    const Case cases[] = {
-        {"abc", false, "abc"},
-        {"_x$1", false, "_x$1"},
-        {"a-b", false, "\\a-b "},
-        {"1abc", false, "\\1abc "},
-        {"$x", false, "\\$x "},
-        {"caf\xc3\xa9", false, "\\caf\xc3\xa9 "},
-        {"", false, ""},
-        {"module", false, "module"},
-        {"data[7]", false, "\\data[7] "},
-        {"data[7]", true, "data[7]"},
-        {"data[07]", true, "data[7]"},
-        {"d[-2]", true, "d[-2]"},
-        {"d[2147483648]", true, "\\d[2147483648] "},
-        {"a-b[3]", true, "\\a-b [3]"},
-        {"a-b[", true, "\\a-b[ "},
-        {longName, false, longName},  // long names survive whole
-        {longStem + "-[12]", true, "\\" + longStem + "- [12]"},
-    };
-    for (const Case& c : cases)
-        EXPECT_EQ(nlw.Escape(c.name.c_str(), c.isBused), c.expected)
-            << c.name.substr(0, 20) << " " << c.isBused;
+    EXPECT_EQ(nlw.Escape(longName.c_str(), 0), longName);
+    EXPECT_EQ(nlw.Escape((longStem + "-[12]").c_str(), 1), "\\" + longStem + "- [12]");
 }
 
 // Results share one buffer; a name that is escaped already comes back as the

@@ -7,9 +7,7 @@ namespace {
 using vwtest::AfterHead;
 using vwtest::TempDir;
 
-const char* const kNoVornix =
-    " The VORNIX environment variable must be set for this program towork. Please check your "
-    "environment to ensure that it is setup properly to use the Vornix tools\n";
+using vwtest::kNoVornix;
 const char* const kNoChipwide =
     "chipwide.v module can't be found in directory $VORNIX/verilog/src\n";
 

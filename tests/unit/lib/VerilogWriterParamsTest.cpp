@@ -134,32 +134,20 @@ TEST_F(VerilogWriterParams, TypeLibraryAddsHexAndBitProperties) {
     Vdm_Property initp("initp", VDM_PROP_STRING), mask("MASK", VDM_PROP_STRING),
         plain("PLAIN", VDM_PROP_STRING);
 
-    struct Case {
-        const char* type;
-        bool hasProps;
-        bool initpHex, initpBit, maskBit;
-    };
-    const Case cases[] = {
-        {"V_FOO", true, true, false, true},     // V_FOO is described under FOO
-        {"FOO", true, true, false, true},       // found directly
-        {"V_FOO", false, false, false, false},  // the block lacks the properties
-        {"X_FOO", true, false, false, false},   // no V_: no second lookup
-        {"V_", true, false, false, false},      // nothing after the underscore
-    };
     nlw_.SetTypeLib(&lib);
     auto writer = MakeWriter();
-    for (const Case& c : cases) {
+    for (const nlwtest::Row& c : nlwtest::Table("type_library_props")) {
         Nlw_NlBlock* u = b_.CreateLeaf(top_, lut_, "u");
-        u->AddProperty(Vdm_Property::NewString("TYPE", c.type));
-        if (c.hasProps) {
+        u->AddProperty(Vdm_Property::NewString("TYPE", c[0].c_str()));
+        if (c[1] == "1") {
             u->AddProperty(Vdm_Property::NewString("INITP", "0"));
             u->AddProperty(Vdm_Property::NewString("MASK", "0"));
             u->AddProperty(Vdm_Property::NewString("PLAIN", "0"));
         }
-        EXPECT_EQ(writer->IsHexStringProperty(&initp, u), c.initpHex) << c.type;
-        EXPECT_EQ(writer->IsBitStringProperty(&initp, u), c.initpBit) << c.type;
-        EXPECT_EQ(writer->IsBitStringProperty(&mask, u), c.maskBit) << c.type;
-        EXPECT_FALSE(writer->IsHexStringProperty(&plain, u)) << c.type;
+        EXPECT_EQ(writer->IsHexStringProperty(&initp, u), c[2] == "1") << c[0];
+        EXPECT_EQ(writer->IsBitStringProperty(&initp, u), c[3] == "1") << c[0];
+        EXPECT_EQ(writer->IsBitStringProperty(&mask, u), c[4] == "1") << c[0];
+        EXPECT_FALSE(writer->IsHexStringProperty(&plain, u)) << c[0];
     }
     // Without a type library only the tables answer.
     nlw_.SetTypeLib(nullptr);

@@ -72,23 +72,12 @@ TEST_F(VerilogWriterPorts, AssignJoinsPortsToDifferentlyNamedNets) {
     b_.AddTypePin(drv, "O", NLW_DIR_OUTPUT);
     // Ports that are neither inputs nor outputs need a driver on their net;
     // those without one take no part, first or last.
-    struct PortCase {
-        const char* name;
-        int dir;
-        const char* net;
-        bool driven;
-    };
-    const PortCase ports[] = {
-        {"u1", NLW_DIR_UNTYPED, "n_u1", false}, {"a", NLW_DIR_INPUT, "net_a", false},
-        {"y", NLW_DIR_OUTPUT, "net_y", false},  {"u2", NLW_DIR_UNTYPED, "n_u2", true},
-        {"io", NLW_DIR_INOUT, "n_io", false},   {"s", NLW_DIR_INPUT, "s", false},
-        {"u3", NLW_DIR_UNTYPED, "n_u3", false},
-    };
-    for (const PortCase& p : ports) b_.AddPort(m, p.name, p.dir);
-    for (const PortCase& p : ports) {
-        Nlw_NlSignal* net = b_.AddSignal(m, p.net);
-        b_.ConnectChild(m->FindPin(p.name), net);
-        if (p.driven) b_.Connect(b_.CreateLeaf(m, drv, "u")->FindPin("O"), net);
+    const std::vector<nlwtest::Row> ports = nlwtest::Table("assign_ports");
+    for (const nlwtest::Row& p : ports) b_.AddPort(m, p[0].c_str(), std::stoi(p[1]));
+    for (const nlwtest::Row& p : ports) {
+        Nlw_NlSignal* net = b_.AddSignal(m, p[2].c_str());
+        b_.ConnectChild(m->FindPin(p[0].c_str()), net);
+        if (p[3] == "1") b_.Connect(b_.CreateLeaf(m, drv, "u")->FindPin("O"), net);
     }
     Port_MsgCapture capture;  // the untyped ports are reported
     // The host counts an inout port as a driver of its own net.

@@ -7,9 +7,7 @@ namespace {
 using vwtest::ScopedEnv;
 using vwtest::TempDir;
 
-const char* const kNoVornix =
-    " The VORNIX environment variable must be set for this program towork. Please check your "
-    "environment to ensure that it is setup properly to use the Vornix tools\n";
+using vwtest::kNoVornix;
 const char* const kNoLibrary =
     "Timcell library directory not found, the `uselib constructis omitted for the -ul option.\n";
 
@@ -106,29 +104,16 @@ TEST_F(VerilogWriterPreamble, LibrarySearchTakesTheFirstRootHoldingTheDirectory)
 }
 
 TEST_F(VerilogWriterPreamble, SdfAnnotateNeedsPropertyOptionAndEnvironment) {
-    struct Case {
-        bool annotated, option, disabled;
-        const char* sdfPath;
-        const char* statement;  // null: none
-    };
-    const Case cases[] = {
-        {true, true, false, "out", "  initial $sdf_annotate(\"out/top.sdf\");\n"},
-        {true, true, false, nullptr, "  initial $sdf_annotate(\"top.sdf\");\n"},
-        {true, true, false, "a\"b\\c\nd", "  initial $sdf_annotate(\"a\\\"b/c\\nd/top.sdf\");\n"},
-        {false, true, false, "out", nullptr},
-        {true, false, false, "out", nullptr},
-        {true, true, true, "out", nullptr},
-    };
-    for (const Case& c : cases) {
-        if (c.annotated)
+    for (const nlwtest::Row& c : nlwtest::Table("sdf_annotate")) {
+        if (c[0] == "1")
             top_->AddProperty(Vdm_Property::NewBool("NLW_SDFANNOTATED", true));
         else
             top_->RemoveProperty("NLW_SDFANNOTATED");
-        params_.SetSdfAnnotate(c.option);
-        params_.SetSdfPath(c.sdfPath);
-        ScopedEnv disable("VOR_SIMMODEL_DISABLE_SDF_ANNOTATE", c.disabled ? "" : nullptr);
-        EXPECT_EQ(Module(top_), std::string("module top (\n);\n") +
-                                    (c.statement ? c.statement : "") + "endmodule\n\n");
+        params_.SetSdfAnnotate(c[1] == "1");
+        params_.SetSdfPath(nlwtest::Opt(c[3]));
+        ScopedEnv disable("VOR_SIMMODEL_DISABLE_SDF_ANNOTATE", c[2] == "1" ? "" : nullptr);
+        EXPECT_EQ(Module(top_),
+                  "module top (\n);\n" + c[4] + (c[4].empty() ? "" : "\n") + "endmodule\n\n");
     }
 }
 

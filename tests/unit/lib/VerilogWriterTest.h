@@ -24,6 +24,11 @@ namespace vwtest {
 using nlwtest::ScopedEnv;
 using nlwtest::TempDir;
 
+// The error of a run without an installation root.
+const char* const kNoVornix =
+    " The VORNIX environment variable must be set for this program towork. Please check your "
+    "environment to ensure that it is setup properly to use the Vornix tools\n";
+
 // Everything a writer needs, with an empty installation root: no device
 // data, no property filter, no library sources.
 class WriterTest : public ::testing::Test {

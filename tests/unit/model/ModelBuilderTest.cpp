@@ -5,6 +5,7 @@
 #include <string>
 #include <vector>
 
+#include "TestFiles.h"
 #include "model/Nlw_NlBuilder.h"
 #include "port/Port.h"
 
@@ -195,49 +196,33 @@ TEST_F(Model, ListsASignalsPinsInConnectionOrder) {
 }
 
 TEST_F(Model, FindsTheDriverOfASignal) {
-    struct Case {
-        const char* what;
-        std::vector<int> leafDirs;  // directions of leaf pins on the signal, in order
-        int portDir;                // direction of a port seen from inside, or 0
-        bool portFirst;
-        int expected;  // index into the pins as connected (port first when portFirst), or -1
-    };
-    const Case cases[] = {
-        {"child output", {NLW_DIR_INPUT, NLW_DIR_OUTPUT}, 0, false, 1},
-        {"input port from inside", {NLW_DIR_INPUT}, NLW_DIR_INPUT, true, 0},
-        {"output port does not drive", {NLW_DIR_INPUT}, NLW_DIR_OUTPUT, true, -1},
-        {"inout child", {NLW_DIR_INPUT, NLW_DIR_INOUT}, 0, false, 1},
-        {"inout port", {NLW_DIR_INPUT}, NLW_DIR_INOUT, false, 1},
-        {"output wins over earlier inout", {NLW_DIR_INOUT, NLW_DIR_OUTPUT}, 0, false, 1},
-        {"untyped does not drive", {NLW_DIR_UNTYPED}, 0, false, -1},
-        {"no pins", {}, 0, false, -1},
-    };
     Nlw_NlType* types[4];
     for (int dir = 0; dir < 4; ++dir) {
         types[dir] = b.AddLibraryType(("C" + std::to_string(dir)).c_str(), false, false);
         b.AddTypePin(types[dir], "P", dir);
     }
     int n = 0;
-    for (const Case& c : cases) {
+    for (const nlwtest::Row& c : nlwtest::Table("drivers")) {
         Nlw_NlBlock* m = b.CreateMacro(top, subType, ("m" + std::to_string(n++)).c_str());
         Nlw_NlSignal* s = b.AddSignal(m, "s");
         std::vector<Nlw_NlPin*> pins;
-        Nlw_NlPin* port = c.portDir ? b.AddPort(m, "p", c.portDir) : nullptr;
-        if (port && c.portFirst) {
+        Nlw_NlPin* port = c[2] != "0" ? b.AddPort(m, "p", std::stoi(c[2])) : nullptr;
+        if (port && c[3] == "1") {
             b.ConnectChild(port, s);
             pins.push_back(port);
         }
-        for (int dir : c.leafDirs) {
-            Nlw_NlBlock* leaf = b.CreateLeaf(m, types[dir], "u");
+        for (char dir : c[1]) {
+            Nlw_NlBlock* leaf = b.CreateLeaf(m, types[dir - '0'], "u");
             b.Connect(leaf->GetPin(0), s);
             pins.push_back(leaf->GetPin(0));
         }
-        if (port && !c.portFirst) {
+        if (port && c[3] != "1") {
             b.ConnectChild(port, s);
             pins.push_back(port);
         }
-        EXPECT_EQ(s->FindDriverPin(), c.expected < 0 ? nullptr : pins[c.expected]) << c.what;
-        EXPECT_EQ(s->FindDriver(false, false), s->FindDriverPin()) << c.what;
+        const int driver = std::stoi(c[4]);
+        EXPECT_EQ(s->FindDriverPin(), driver < 0 ? nullptr : pins[driver]) << c[0];
+        EXPECT_EQ(s->FindDriver(false, false), s->FindDriverPin()) << c[0];
     }
 }
 

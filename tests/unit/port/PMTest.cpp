@@ -16,27 +16,16 @@ using hosttest::TempDir;
 using hosttest::WriteFile;
 
 std::string Text(const char* s) {
-    return s ? s : "(null)";
+    return s ? s : "-";
 }
 
 TEST(PmPic, SplitsThePartName) {
-    struct Case {
-        const char* part;
-        const char* device;
-        const char* package;
-        const char* speed;
-    };
-    const Case cases[] = {
-        {"vx100-fg256-5", "vx100", "fg256", "5"}, {"vx100", "vx100", "(null)", "(null)"},
-        {"vx100--5", "vx100", "(null)", "5"},     {"vx100-fg256-5-es", "vx100", "fg256", "5-es"},
-        {"", "(null)", "(null)", "(null)"},
-    };
-    for (const Case& c : cases) {
-        PM_PIC pic(c.part, true, 0);
-        EXPECT_EQ(Text(pic.get_device()), c.device) << c.part;
-        EXPECT_EQ(Text(pic.get_package()), c.package) << c.part;
-        EXPECT_EQ(Text(pic.get_speed()), c.speed) << c.part;
-        EXPECT_STREQ(pic.get_partname(), c.part);
+    for (const nlwtest::Row& c : nlwtest::Table("parts")) {
+        PM_PIC pic(c[0].c_str(), true, 0);
+        EXPECT_EQ(Text(pic.get_device()), c[1]) << c[0];
+        EXPECT_EQ(Text(pic.get_package()), c[2]) << c[0];
+        EXPECT_EQ(Text(pic.get_speed()), c[3]) << c[0];
+        EXPECT_STREQ(pic.get_partname(), c[0].c_str());
     }
     PM_PIC none(nullptr, true, 0);
     EXPECT_STREQ(none.get_partname(), "");
@@ -62,15 +51,8 @@ protected:
 };
 
 TEST_F(PmDevkey, ReadsListsUnderKeys) {
-    WriteFile(dir_ / "first/data/device.key",
-              "# device data\n"
-              "HexStringProperty = INIT, INITP_00 ,SRVAL\n"
-              "\n"
-              "   # an indented comment\n"
-              "BitStringProperty=MODE\r\n"
-              "HexStringProperty = INIT_A,,INIT_B,\n"            // a second line appends
-              "BigEndingTimcell = X_RAMB16:'DOA':DOB, X_MULT\n"  // quotes and colons stay
-              "Empty =\n");
+    // A second line of a key appends; quotes and colons stay in an item.
+    WriteFile(dir_ / "first/data/device.key", nlwtest::Data("pm/device.key"));
     PM_PIC pic("vx100-fg256-5", true, 0);
     PM_DEVKEY key("device.key", &pic, false, true, true);
     EXPECT_TRUE(key.IsLoaded());

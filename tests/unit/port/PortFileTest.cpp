@@ -61,24 +61,11 @@ TEST(PortFile, ExistOpenAndReadAll) {
 
 TEST(PortStream, ReadlineStripsLineEnds) {
     TempDir dir;
-    using V = std::vector<std::string>;
-    struct Case {
-        const char* content;
-        V lines;
-    };
-    const Case cases[] = {
-        {"", V{}},
-        {"a\nb", V{"a", "b"}},  // last line without a line end
-        {"a\r\nb\r\n", V{"a", "b"}},
-        {"a\rb\n", V{"a\rb"}},  // a lone carriage return is text
-        {"\n\nx\n\n", V{"", "", "x", ""}},
-        {"end\r", V{"end\r"}},
-    };
-    for (const Case& c : cases) {
-        WriteFile(dir / "f", c.content);
-        EXPECT_EQ(LinesInPieces(dir / "f", 1024), c.lines) << c.content;
-        EXPECT_EQ(WholeLines(dir / "f"), c.lines) << c.content;
-        EXPECT_EQ(WholeLines(dir / "f", 2), c.lines) << c.content;  // tiny read buffer
+    for (const nlwtest::Row& c : nlwtest::Table("readline")) {
+        WriteFile(dir / "f", c[0]);
+        EXPECT_EQ(nlwtest::Bracketed(LinesInPieces(dir / "f", 1024)), c[1]) << c[0];
+        EXPECT_EQ(nlwtest::Bracketed(WholeLines(dir / "f")), c[1]) << c[0];
+        EXPECT_EQ(nlwtest::Bracketed(WholeLines(dir / "f", 2)), c[1]) << c[0];  // tiny read buffer
     }
 }
 

@@ -4,12 +4,12 @@
 #include <string>
 #include <vector>
 
+#include "TestFiles.h"
 #include "port/Port.h"
 
 namespace {
 
 using Port::String;
-using V = std::vector<std::string>;
 
 TEST(Vorform, NeverTruncatesLongText) {
     EXPECT_STREQ(vorform("%d'h%s|%-4s|", 16, "ABCD", "ab"), "16'hABCD|ab  |");
@@ -61,59 +61,20 @@ TEST(HostString, CompareAndCase) {
 }
 
 TEST(HostString, GetUINT32ReadsWholeDecimalText) {
-    struct Case {
-        const char* text;
-        uint32_t value;
-        bool ok;
-    };
-    const Case cases[] = {
-        {"0", 0, true},
-        {"007", 7, true},
-        {"4294967295", 4294967295u, true},
-        {"4294967296", 0, false},
-        {"", 0, false},
-        {"12a", 0, false},
-        {" 12", 0, false},
-        {"-1", 0, false},
-        {"+3", 0, false},
-        {"99999999999999999999", 0, false},
-    };
-    for (const Case& c : cases) {
-        bool ok = !c.ok;
-        EXPECT_EQ(String(c.text).GetUINT32(&ok), c.value) << c.text;
-        EXPECT_EQ(ok, c.ok) << c.text;
+    for (const nlwtest::Row& c : nlwtest::Table("uint32")) {
+        bool ok = c[2] != "1";
+        EXPECT_EQ(String(c[0].c_str()).GetUINT32(&ok), std::stoul(c[1])) << c[0];
+        EXPECT_EQ(ok, c[2] == "1") << c[0];
     }
 }
 
 TEST(HostString, SplitAtSeparatorsOutsideQuotes) {
-    struct Case {
-        const char* text;
-        const char* seps;
-        bool skipEmpty;
-        const char *open, *close;
-        V pieces;
-    };
-    const Case cases[] = {
-        {"16'h0000", "'", true, "", "", {"16", "h0000"}},
-        {"a::b:", ":", true, nullptr, nullptr, {"a", "b"}},
-        {"a::b:", ":", false, nullptr, nullptr, {"a", "", "b", ""}},
-        {"a b,c", " ,", true, "", "", {"a", "b", "c"}},
-        {"", ":", true, "", "", {}},
-        {"", ":", false, "", "", {""}},
-        {"abc", "", true, "", "", {"abc"}},
-        // The item syntax of the inclusion maps: key:name:name with ' quotes.
-        {"RAMB16:'A:B':C", ":", true, "'", "'", {"RAMB16", "A:B", "C"}},
-        {"'a:b'c:d", ":", true, "'", "'", {"a:bc", "d"}},           // text after the quote stays
-        {"a'b:c'", ":", true, "'", "'", {"a'b", "c'"}},             // a quote inside is text
-        {"k:'open:rest", ":", true, "'", "'", {"k", "open:rest"}},  // unclosed: to the end
-        {"a:'':b", ":", true, "'", "'", {"a", "", "b"}},            // a quoted empty piece stays
-        {"[a b] (c d) e", " ", true, "[(", "])", {"a b", "c d", "e"}},  // paired by position
-    };
-    for (const Case& c : cases) {
-        V got;
-        for (const String& s : String::Split(c.text, c.seps, c.skipEmpty, c.open, c.close))
-            got.push_back(s.str());
-        EXPECT_EQ(got, c.pieces) << c.text;
+    for (const nlwtest::Row& c : nlwtest::Table("split")) {
+        std::string got;
+        for (const String& s : String::Split(c[0].c_str(), c[1].c_str(), c[2] == "1",
+                                             nlwtest::Opt(c[3]), nlwtest::Opt(c[4])))
+            got += "<" + s.str() + ">";
+        EXPECT_EQ(got, c[5]) << c[0];
     }
     EXPECT_TRUE(String::Split(nullptr, ":", true, "", "").empty());
 }

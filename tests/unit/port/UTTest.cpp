@@ -3,6 +3,7 @@
 
 #include <string>
 
+#include "TestFiles.h"
 #include "port/Port.h"
 #include "port/UT.h"
 
@@ -23,33 +24,9 @@ TEST(UtStr, ComparisonsIgnoringCase) {
 }
 
 TEST(UtStr, IMatchPatterns) {
-    struct Case {
-        const char* text;
-        const char* pattern;
-        bool match;
-    };
-    const Case cases[] = {
-        {"\\abc ", "\\* ", true},        // an escaped name
-        {"\\abc [3]", "\\* [*]", true},  // an escaped bus bit
-        {"\\abc[3]", "\\* [*]", false},
-        {"abc", "\\* ", false},
-        {"Init_00", "INIT_*", true},
-        {"INIT", "init_*", false},
-        {"xINIT_00", "INIT_*", false},
-        {"", "*", true},
-        {"", "", true},
-        {"a", "", false},
-        {"", "a", false},
-        {"ac", "a*c", true},
-        {"abcbc", "a*bc", true},
-        {"abcbd", "a*bc", false},
-        {"aaa", "a**a", true},
-        {"ab", "*c*", false},
-        {"a?c", "a?c", true},
-        {"abc", "a?c", false},  // only the star is special
-    };
-    for (const Case& c : cases)
-        EXPECT_EQ(UT_STR::IMatch(c.text, c.pattern) != 0, c.match) << c.text << " ~ " << c.pattern;
+    for (const nlwtest::Row& c : nlwtest::Table("imatch"))
+        EXPECT_EQ(UT_STR::IMatch(c[0].c_str(), c[1].c_str()) != 0, c[2] == "1")
+            << c[0] << " ~ " << c[1];
     EXPECT_EQ(UT_STR::IMatch(nullptr, "*"), 1);
 }
 
@@ -69,46 +46,18 @@ TEST(UtStr, FindStringAndGetToken) {
     EXPECT_EQ(UT_STR::FindString(text, "cells"), text + 4);
     EXPECT_EQ(UT_STR::FindString(text, "none"), nullptr);
     EXPECT_EQ(UT_STR::FindString(nullptr, "a"), nullptr);
-    struct Case {
-        const char *text, *seps;
-        char sep;
-        const char* token;
-    };
-    const Case cases[] = {
-        {"key=value", "=:", '=', "key"},
-        {"a:b=c", "=:", ':', "a"},
-        {"plain", "=:", '\0', "plain"},
-        {"=x", "=", '=', ""},
-    };
-    for (const Case& c : cases) {
+    for (const nlwtest::Row& c : nlwtest::Table("tokens")) {
         std::string token = "stale";
-        EXPECT_EQ(UT_STR::GetToken(c.text, token, c.seps), c.sep) << c.text;
-        EXPECT_EQ(token, c.token) << c.text;
+        EXPECT_EQ(UT_STR::GetToken(c[0].c_str(), token, c[1].c_str()), c[2][0]) << c[0];
+        EXPECT_EQ(token, c[3]) << c[0];
     }
 }
 
 TEST(UtPath, BaseRootAndDirectory) {
-    struct Case {
-        const char *path, *base, *root, *dir;
-    };
-    const Case cases[] = {
-        {"a/b/top.v", "top", "a/b/top", "a/b/"},
-        {"top", "top", "top", ""},
-        {"/top.v", "top", "/top", "/"},
-        {"./x", "x", "./x", "./"},
-        {"top.tar.gz", "top.tar", "top.tar", ""},
-        {"dir.d/top", "top", "dir.d/top", "dir.d/"},  // a dot in a directory is no extension
-        {"/abs/design.ver", "design", "/abs/design", "/abs/"},
-        {".hidden", ".hidden", ".hidden", ""},  // a leading dot starts no extension
-        {"dir/.hidden.v", ".hidden", "dir/.hidden", "dir/"},
-        {"top.", "top", "top", ""},
-        {"dir/", "", "dir/", "dir/"},
-        {"", "", "", ""},
-    };
-    for (const Case& c : cases) {
-        EXPECT_EQ(UT_PATH::GetBase(c.path), c.base) << c.path;
-        EXPECT_EQ(UT_PATH::GetRoot(c.path), c.root) << c.path;
-        EXPECT_STREQ(Port::FileName(c.path).GetPath(), c.dir) << c.path;
+    for (const nlwtest::Row& c : nlwtest::Table("paths")) {
+        EXPECT_EQ(UT_PATH::GetBase(c[0].c_str()), c[1]) << c[0];
+        EXPECT_EQ(UT_PATH::GetRoot(c[0].c_str()), c[2]) << c[0];
+        EXPECT_STREQ(Port::FileName(c[0].c_str()).GetPath(), c[3].c_str()) << c[0];
     }
     EXPECT_EQ(UT_PATH::GetRoot(nullptr), "");
     EXPECT_STREQ(Port::FileName(nullptr).GetPath(), "");

@@ -43,28 +43,11 @@ TEST(CellLibrary, ReadsCellsPinsBusesAndPads) {
 }
 
 TEST(CellLibrary, RefusesMalformedLinesWithTheirNumber) {
-    struct Case {
-        const char* text;
-        const char* part;
-    } cases[] = {
-        {"pin X input\n", ":1: 'pin' before the first 'cell'"},
-        {"cell A slowcell\n", ":1: unknown cell class 'slowcell'"},
-        {"cell A timcell\npin X sideways\n", ":2: unknown direction 'sideways'"},
-        {"cell A timcell\nbus D input 7\n", ":2: expected 'bus NAME DIR MSB LSB'"},
-        {"cell A timcell\nbus D input 7 x\n", ":2: bad bus range"},
-        {"cell A timcell\nbus D input 99999999999 0\n", ":2: bad bus range"},
-        {"cell A timcell\nbus D input 16777216 0\n", ":2: bus 'D' is 16777217 bits wide"},
-        {"cell A timcell\nbus D input -2147483648 2147483647\n", ":2: bus 'D' is 4294967296 bits"},
-        {"cell A timcell\npin X input\npin X output\n", ":3: pin 'X' of cell 'A' is given twice"},
-        {"cell A timcell\ncell A timcell\n", ":2: cell 'A' is defined twice"},
-        {"cell A timcell extra\n", ":1: unexpected 'extra'"},
-        {"cells A timcell\n", ":1: unknown keyword 'cells'"},
-    };
-    for (const Case& c : cases) {
+    for (const nlwtest::Row& c : nlwtest::Table("cell_library_faults")) {
         Nlw_CellLibrary lib;
         std::string error;
-        EXPECT_FALSE(lib.Parse(c.text, "lib.dat", error)) << c.text;
-        EXPECT_TRUE(Contains(error, std::string("lib.dat") + c.part)) << error;
+        EXPECT_FALSE(lib.Parse(c[0], "lib.dat", error)) << c[0];
+        EXPECT_TRUE(Contains(error, "lib.dat" + c[1])) << error;
     }
 }
 

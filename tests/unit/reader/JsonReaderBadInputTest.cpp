@@ -23,25 +23,11 @@ void ExpectOneError(const Loaded& l, const std::string& file,
 // connection names, the cycle, the byte offset and line of malformed JSON.
 TEST(JsonReaderBadInput, ReportsEachFaultOnce) {
     Installation inst(DataFiles{{"cells.dat", TestCells()}});
-    const std::pair<const char*, const char*> cases[] = {
-        {"wrong_type.json", nullptr},
-        {"bad_bit.json", nullptr},
-        {"no_modules.json", nullptr},
-        {"not_an_object.json", nullptr},
-        {"no_top.json", nullptr},
-        {"two_tops.json", nullptr},
-        {"self_cycle.json", nullptr},
-        {"two_cycle.json", nullptr},
-        {"port_without_bits.json", nullptr},
-        {"unknown_port.json", nullptr},
-        {"malformed.json", nullptr},
-        {"two_tops.json", "nothere"},  // a missing top
-    };
     std::string errors;
-    for (const auto& [file, top] : cases) {
+    for (const nlwtest::Row& c : nlwtest::Table("bad_designs")) {
         Nlw_ReadOptions opt;
-        opt.top = top;
-        const std::string path = kBad + file;
+        opt.top = nlwtest::Opt(c[1]);
+        const std::string path = kBad + c[0];
         Loaded l = LoadFile(path, opt);
         ExpectOneError(l, path, {});
         if (!l.errors.empty()) errors += nlwtest::Replaced(l.errors[0], kBad, "<bad>/");
@@ -60,27 +46,12 @@ TEST(JsonReaderBadInput, ReportsTheSystemReasonForAnUnreadableFile) {
 }
 
 TEST(JsonReaderBadInput, SurvivesDeepNestingAndOddDocuments) {
-    const std::string deep = std::string(100000, '[') + std::string(100000, ']');
-    struct Case {
-        std::string text;
-        std::string part;
-    } cases[] = {
-        {deep, "malformed JSON"},  // deeper than the parser goes
-        {std::string(100000, '['), "malformed JSON at byte offset 100000"},
-        {"", "malformed JSON"},
-        {"{\"modules\": {\"m\": {\"ports\": {}}}} x", "at byte offset 34"},
-        {"{\"modules\": {\"m\": {\"ports\": {\"p\": {\"bits\": [2], \"direction\": 5}}}}}",
-         "\"direction\" must be a string"},
-        {"{\"modules\": {\"m\": {\"ports\": {}, \"cells\": {\"c\": {\"type\": \"X\", "
-         "\"parameters\": {\"P\": [1]}}}}}}",
-         "cell 'c' parameter 'P': expected a string or a number"},
-        {"{\"modules\": {\"m\": {\"ports\": {\"p\": {\"direction\": \"input\", \"bits\": [-4]}}}}}",
-         "bad bit value -4"},
-    };
-    for (const Case& c : cases) {
-        Loaded l = LoadText(c.text, {}, "odd.json");
-        ExpectOneError(l, "odd.json", {c.part});
-    }
+    std::vector<nlwtest::Row> cases = nlwtest::Table("odd_documents");
+    // Deeper than the parser goes, and never closed.
+    cases.push_back({std::string(100000, '[') + std::string(100000, ']'), "malformed JSON"});
+    cases.push_back({std::string(100000, '['), "malformed JSON at byte offset 100000"});
+    for (const nlwtest::Row& c : cases)
+        ExpectOneError(LoadText(c[0], {}, "odd.json"), "odd.json", {c[1]});
 }
 
 }  // namespace

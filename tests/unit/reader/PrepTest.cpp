@@ -13,17 +13,8 @@ using namespace readertest;
 
 namespace {
 
-std::unique_ptr<Vdm_Property> Bits(const char* v) {
-    return std::unique_ptr<Vdm_Property>(Vdm_Property::NewBits("P", v));
-}
-std::unique_ptr<Vdm_Property> Int(int v) {
-    return std::unique_ptr<Vdm_Property>(Vdm_Property::NewInt("P", v));
-}
-std::unique_ptr<Vdm_Property> Float(double v) {
-    return std::unique_ptr<Vdm_Property>(Vdm_Property::NewFloat("P", v));
-}
-std::unique_ptr<Vdm_Property> Str(const char* v) {
-    return std::unique_ptr<Vdm_Property>(Vdm_Property::NewString("P", v));
+std::unique_ptr<Vdm_Property> Make(const std::string& kind, const std::string& v) {
+    return std::unique_ptr<Vdm_Property>(nlwtest::NewProperty(kind, "P", v));
 }
 
 // "9:text", "3:number", "1:number" or "none".
@@ -42,80 +33,20 @@ std::string Describe(const Vdm_Property* p) {
 }
 
 TEST(PrepConvert, TurnsFileValuesIntoWhatTheDefinitionExpects) {
-    struct Case {
-        std::unique_ptr<Vdm_Property> value;
-        const char* type;
-        std::string expected;
-    };
-    Case cases[] = {
-        {Bits("0001001000110100"), "HV", "9:1234"},
-        {Bits("101"), "hv", "9:5"},   // padded to whole digits; any case
-        {Bits("1x01"), "HV", "9:9"},  // unknown bits count as 0
-        {Bits("10x1"), "BV", "9:10x1"},
-        {Bits("101"), "I", "3:5"},
-        {Bits("11111111111111111111111111111111"), "I", "3:-1"},
-        {Bits("11"), "S", "3:3"},
-        {Bits("10"), "F", "1:" + std::to_string(2.0)},
-        {Bits("1"), "BL", "9:TRUE"},
-        {Bits("0"), "BL", "9:FALSE"},
-        {Bits("01"), "Q", "none"},
-        {Int(255), "HV", "9:FF"},
-        {Int(5), "BV", "9:101"},
-        {Int(7), "I", "none"},
-        {Int(7), "S", "none"},
-        {Int(3), "F", "1:" + std::to_string(3.0)},
-        {Int(0), "BL", "9:FALSE"},
-        {Float(4.0), "I", "3:4"},
-        {Float(4.5), "I", "none"},
-        {Float(2.5), "F", "none"},
-        {Str("12"), "I", "3:12"},
-        {Str("x"), "I", "none"},
-        {Str("FAST"), "S", "none"},
-        {Str("ABCD"), "HV", "none"},
-    };
-    for (const Case& c : cases) {
-        std::unique_ptr<Vdm_Property> out = Nlw_Prep::Convert(*c.value, c.type);
-        EXPECT_EQ(Describe(out.get()), c.expected)
-            << Describe(c.value.get()) << " " << c.value->GetType() << " as " << c.type;
+    for (const nlwtest::Row& c : nlwtest::Table("prep_convert")) {
+        std::unique_ptr<Vdm_Property> out = Nlw_Prep::Convert(*Make(c[0], c[1]), c[2].c_str());
+        EXPECT_EQ(Describe(out.get()), c[3]) << c[0] << " " << c[1] << " as " << c[2];
         if (out) {
             EXPECT_STREQ(out->GetName(), "P");
         }
     }
-    std::unique_ptr<Vdm_Property> b(Vdm_Property::NewBool("P", true));
-    EXPECT_EQ(Describe(Nlw_Prep::Convert(*b, "BL").get()), "9:TRUE");
 }
 
 TEST(PrepLiteral, WritesTheFileValueAsAVerilogLiteral) {
-    struct Case {
-        std::unique_ptr<Vdm_Property> value;
-        const char* literal;  // null: no literal
-    };
-    Case cases[] = {
-        {Bits("1000000000000000"), "16'h8000"},
-        {Bits("00001010"), "8'h0A"},
-        {Bits("101"), "3'b101"},
-        {Bits("10x0"), "4'b10x0"},
-        {Bits("zzzz"), "4'bzzzz"},
-        {Int(-7), "-7"},
-        {Float(2.5), "2.5"},
-        {Float(3.0), "3.0"},
-        {Float(1e20), "1e+20"},
-        {Float(0.1), "0.1"},
-        {Str("FAST"), "\"FAST\""},
-        {Str("a\"b\\c"), "\"a\\\"b\\\\c\""},
-        {Str("two\nlines"), "\"two\\nlines\""},
-        {Str(""), "\"\""},
-        {std::unique_ptr<Vdm_Property>(Vdm_Property::NewBool("P", false)), "1'b0"},
-        {std::unique_ptr<Vdm_Property>(Vdm_Property::NewList("P")), nullptr},
-        {Bits(""), nullptr},
-    };
-    for (const Case& c : cases) {
-        std::string out;
-        bool ok = Nlw_Prep::VerilogLiteral(*c.value, out);
-        EXPECT_EQ(ok, c.literal != nullptr) << Describe(c.value.get());
-        if (c.literal) {
-            EXPECT_EQ(out, c.literal) << Describe(c.value.get());
-        }
+    for (const nlwtest::Row& c : nlwtest::Table("prep_literal")) {
+        std::string out = "-";
+        EXPECT_EQ(Nlw_Prep::VerilogLiteral(*Make(c[0], c[1]), out), c[2] != "-") << c[1];
+        EXPECT_EQ(out, c[2]) << c[0] << " " << c[1];
     }
 }
 

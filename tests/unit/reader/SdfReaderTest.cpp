@@ -42,69 +42,19 @@ Read ReadSdf(Loaded& design, const std::string& text) {
 
 TEST(SdfReader, MatchesEntriesByTheDesignsNames) {
     Installation inst(DataFiles{{"cells.dat", TestCells()}});
-    const struct {
-        const char* what;
-        bool flatten;
-        const char* text;  // after the head
-        size_t entries;
-        bool error;           // a malformed file: one error
-        const char* message;  // the error, or the first warning ("" for none)
-    } cases[] = {
-        {"cell path and check, ns to ps", false,
-         "(CELL (CELLTYPE \"FD\") (INSTANCE u1/r) (DELAY (ABSOLUTE (IOPATH C Q (0.1:0.2:0.3))))"
-         " (TIMINGCHECK (SETUPHOLD (posedge D) (posedge C) (0.05) (0.01)))))",
-         2, false, ""},
-        {"the same in a flattened design", true,
-         "(CELL (CELLTYPE \"FD\") (INSTANCE u1/r) (DELAY (ABSOLUTE (IOPATH C Q (1))))))", 1, false,
-         ""},
-        {"escaped divider character in a name", false,
-         "(CELL (CELLTYPE \"LUT2\") (INSTANCE u1/l\\.x) (DELAY (ABSOLUTE (IOPATH I0 O (1))))))", 1,
-         false, ""},
-        {"interconnect across the hierarchy", false,
-         "(CELL (CELLTYPE \"top\") (INSTANCE) (DELAY (ABSOLUTE"
-         " (INTERCONNECT \\$g/O u1/l\\.x/I1 (1:2:3) (4:5:6))))))",
-         1, false, ""},
-        {"unknown instance", false,
-         "(CELL (CELLTYPE \"FD\") (INSTANCE u1/nope) (DELAY (ABSOLUTE (IOPATH C Q (1))))))", 0,
-         false, "t.sdf:2: no instance 'u1/nope' in the design"},
-        {"pin the cell lacks", false,
-         "(CELL (CELLTYPE \"FD\") (INSTANCE u1/r) (DELAY (ABSOLUTE (IOPATH CE Q (1))))))", 0, false,
-         "has no pin 'CE'"},
-        {"CELLTYPE of another type", false,
-         "(CELL (CELLTYPE \"LUT2\") (INSTANCE u1/r) (DELAY (ABSOLUTE (IOPATH C Q (1))))))", 0,
-         false, "is of type 'FD', not 'LUT2'"},
-        {"conditional path", false,
-         "(CELL (CELLTYPE \"FD\") (INSTANCE u1/r) (DELAY (ABSOLUTE (COND D (IOPATH C Q (1)))))))",
-         0, false, "COND entries are not supported"},
-        {"delay that is not a number", false,
-         "(CELL (CELLTYPE \"FD\") (INSTANCE u1/r)\n(DELAY (ABSOLUTE (IOPATH C Q (1:x:3))))))", 0,
-         true, "t.sdf:3: delay value 'x' is not a number"},
-        {"truncated file", false,
-         "(CELL (CELLTYPE \"FD\") (INSTANCE u1/r) (DELAY (ABSOLUTE (IOPATH C Q (1", 0, true,
-         "t.sdf:2: expected ')', found the end of the file"},
-        {"two values of a triple", false,
-         "(CELL (CELLTYPE \"FD\") (INSTANCE u1/r) (DELAY (ABSOLUTE (IOPATH C Q (1:2))))))", 0, true,
-         "'1:2' is neither one value nor three"},
-    };
-    for (const auto& c : cases) {
-        SCOPED_TRACE(c.what);
+    std::string text;
+    for (const nlwtest::Row& c : nlwtest::Table("sdf_entries")) {
         Nlw_ReadOptions options;
-        options.flatten = c.flatten;
+        options.flatten = c[1] == "1";
         Loaded design = LoadText(kDesign, options);
         ASSERT_TRUE(design.ok);
-        Read r = ReadSdf(design, std::string(kHead) + c.text);
-        const bool wantError = c.error;
-        EXPECT_EQ(r.ok, !wantError);
-        EXPECT_EQ(r.timing.entries.size(), c.entries);
-        const std::vector<std::string>& got = wantError ? r.errors : r.warnings;
-        if (*c.message == '\0') {
-            EXPECT_TRUE(r.warnings.empty() && r.errors.empty());
-        } else {
-            ASSERT_FALSE(got.empty());
-            EXPECT_NE(got[0].find(c.message), std::string::npos) << got[0];
-            EXPECT_EQ(got.size(), wantError ? 1u : 2u);  // the warning and the count
-        }
+        Read r = ReadSdf(design, std::string(kHead) + c[2]);
+        text += c[0] + ": " + (r.ok ? "ok" : "failed") + ", " +
+                std::to_string(r.timing.entries.size()) + " entries\n";
+        for (const std::string& e : r.errors) text += "  error: " + e;
+        for (const std::string& w : r.warnings) text += "  warning: " + w;
     }
+    nlwtest::ExpectGolden("reader/sdf_entries", text);
 }
 
 TEST(SdfReader, KeepsValuesEdgesAndPinsOfAnEntry) {
