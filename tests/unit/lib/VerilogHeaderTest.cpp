@@ -1,5 +1,8 @@
-// The stock netlist head, the run-parameter block, the closing notices and
-// the output file names.
+// The file heads: the stock netlist head, the run-parameter block, the
+// closing notices and the output file names; the library search and the
+// timing annotation statement; the chipwide module, the device-data maps and
+// the included cell models.
+
 #include "TestFiles.h"
 #include "VerilogWriterTest.h"
 #include "framework/Nlw_Writer.h"
@@ -21,6 +24,10 @@ struct Nlw_VerilogTestPeer {
 namespace {
 
 using Peer = Nlw_VerilogTestPeer;
+using vwtest::AfterHead;
+using vwtest::kNoVornix;
+using vwtest::ScopedEnv;
+using vwtest::TempDir;
 
 // A writer that keeps its text in memory.
 class MemoryWriter : public Nlw_Writer {
@@ -172,6 +179,279 @@ TEST_F(VerilogHeader, FileNamesDeriveFromTheNetlistName) {
     const std::string longDir(1500, 'd');
     params_.SetOutputFileName((longDir + "/top.v").c_str());
     EXPECT_EQ(Peer::RootFileName(nlw_, ".pin"), longDir + "/top.pin");
+}
+
+// ---------------------------------------------------------------------------
+// File heads, the library search and the timing annotation statement.
+
+const char* const kNoLibrary =
+    "Timcell library directory not found, the `uselib constructis omitted for the -ul option.\n";
+
+class VerilogWriterPreamble : public vwtest::WriterTest {
+protected:
+    VerilogWriterPreamble() {
+        top_ = b_.CreateRoot(b_.AddModuleType("top"), "top");
+        params_.SetInsert_chipwide(false);
+        params_.SetCommandLine("qdb2ver -w top.qdb");
+        params_.SetInputFileName("top.qdb");
+        params_.SetVornix("/opt/vornix");
+        b_.SetDevice("vx100 fg256 -5", "vx100-fg256-5");
+    }
+    // The lines of the head from the purpose label to the time scale.
+    std::string Purpose() {
+        const std::string text = View();
+        const size_t begin = text.find("// Purpose:");
+        return text.substr(begin, text.find("`timescale") - begin);
+    }
+
+    Nlw_NlBlock* top_ = nullptr;
+};
+
+// Header fields are user texts inside "//" comments: a line break in one
+// must not push the rest of the text out of the comment.
+TEST_F(VerilogWriterPreamble, LineBreaksInHeaderFieldsStayInsideTheComment) {
+    params_.SetCommandLine("qdb2ver \"a\nmodule evil;\" top.qdb");
+    params_.SetInputFileName("dir\r\nx.qdb");
+    const std::string text = View();
+    EXPECT_NE(text.find("// Command\t: qdb2ver \"a module evil;\" top.qdb\n"), std::string::npos)
+        << text;
+    EXPECT_NE(text.find("// Input file\t: dir  x.qdb\n"), std::string::npos) << text;
+    EXPECT_EQ(text.find("\nmodule evil"), std::string::npos);
+}
+
+TEST_F(VerilogWriterPreamble, SingleFileHead) {
+    nlwtest::ExpectGolden("preamble/single_file_head", View());
+}
+
+TEST_F(VerilogWriterPreamble, ModuleFileNamesItsModule) {
+    Nlw_NlBlock* sub = b_.CreateMacro(top_, b_.AddModuleType("sub"), "s1");
+    auto writer = MakeWriter();
+    writer->WriteMHBlock(sub);
+    const std::string text = writer->GetMemoryText();
+    EXPECT_NE(text.find("//  --|      |--  Filename: sub.v\n"), std::string::npos);
+    EXPECT_NE(text.find("// Design Name\t: demo\n// Module Name: sub\n// Vornix  "),
+              std::string::npos);
+    EXPECT_EQ(View().find("Module Name"), std::string::npos);
+}
+
+TEST_F(VerilogWriterPreamble, PurposeTextsFollowTheModesInFixedOrder) {
+    params_.SetSimMode(false);
+    params_.SetStaMode(true);
+    params_.SetEcnMode(true);
+    params_.SetWritePsTimePrecision(false);
+    nlwtest::ExpectGolden("preamble/purpose_texts_follow_the_modes_in_fixed_order", Purpose());
+    EXPECT_NE(View().find("\n`timescale 1 ns/10 ps\n\n"), std::string::npos);
+}
+
+TEST_F(VerilogWriterPreamble, LibrarySearchTakesTheFirstRootHoldingTheDirectory) {
+    params_.SetWriteUseLib(true);
+    TempDir r1, r2, r3;
+    const std::string plainFile = r1.File("plain", "x");
+    r2.Dir("verilog/src/timcells");
+    r2.Dir("verilog/src/funcells");
+    r3.Dir("verilog/src/timcells");
+    struct Case {
+        std::string roots;
+        bool funcell;
+        std::string line;  // empty: none found
+        std::vector<std::string> errors;
+    };
+    const Case cases[] = {
+        {plainFile + ":/no/such/dir:" + r1.Path() + ":" + r2.Path() + ":" + r3.Path(),
+         false,
+         "`uselib dir=" + r2.Path() + "/verilog/src/timcells libext=.v\n",
+         {}},
+        {r3.Path() + ":" + r2.Path(),
+         true,
+         "`uselib dir=" + r2.Path() + "/verilog/src/funcells libext=.v\n",
+         {}},
+        {r1.Path(), false, "", {kNoLibrary}},
+        {"", false, "", {kNoVornix, kNoLibrary}},
+    };
+    for (const Case& c : cases) {
+        vornix_.Set(c.roots.c_str());
+        params_.SetFuncellMode(c.funcell);
+        Port_MsgCapture capture;
+        const std::string text = View();
+        EXPECT_NE(text.find("`timescale 1 ns/1 ps\n" + c.line + "\nmodule top"), std::string::npos)
+            << c.roots;
+        EXPECT_EQ(capture.Texts(Port_MsgLevel::Error), c.errors) << c.roots;
+    }
+}
+
+TEST_F(VerilogWriterPreamble, SdfAnnotateNeedsPropertyOptionAndEnvironment) {
+    for (const nlwtest::Row& c : nlwtest::Table("sdf_annotate")) {
+        if (c[0] == "1")
+            top_->AddProperty(Vdm_Property::NewBool("NLW_SDFANNOTATED", true));
+        else
+            top_->RemoveProperty("NLW_SDFANNOTATED");
+        params_.SetSdfAnnotate(c[1] == "1");
+        params_.SetSdfPath(nlwtest::Opt(c[3]));
+        ScopedEnv disable("VOR_SIMMODEL_DISABLE_SDF_ANNOTATE", c[2] == "1" ? "" : nullptr);
+        EXPECT_EQ(Module(top_),
+                  "module top (\n);\n" + c[4] + (c[4].empty() ? "" : "\n") + "endmodule\n\n");
+    }
+}
+
+TEST_F(VerilogWriterPreamble, ShortModuleFileHead) {
+    params_.SetWriteUseLib(true);
+    params_.SetFuncellMode(true);  // the short head always looks for timcells
+    root_.Dir("verilog/src/timcells");
+    auto writer = MakeWriter();
+    writer->WriteMHHeader(top_);
+    nlwtest::ExpectGolden("preamble/short_head",
+                          nlwtest::Replaced(writer->GetMemoryText(), root_.Path(), "<root>"));
+    // The disclaimer follows the mode, equivalence checking first.
+    params_.SetWriteUseLib(false);
+    for (const char* tools : {"sta", "ecn"}) {
+        params_.SetStaMode(true);
+        params_.SetEcnMode(tools[0] == 'e');
+        writer = MakeWriter();
+        writer->WriteMHHeader(top_);
+        nlwtest::ExpectGolden(std::string("preamble/short_head_") + tools, writer->GetMemoryText());
+    }
+}
+
+// ---------------------------------------------------------------------------
+// The chipwide module, the device-data maps and the included cell models.
+
+const char* const kNoChipwide =
+    "chipwide.v module can't be found in directory $VORNIX/verilog/src\n";
+
+using Strings = std::vector<std::string>;
+using Entries = std::vector<std::pair<std::string, std::string>>;
+
+Entries ToEntries(const std::multimap<Port::String, Port::String>& map) {
+    Entries out;
+    for (const auto& e : map) out.emplace_back(e.first.str(), e.second.str());
+    return out;
+}
+
+class VerilogWriterLibrary : public vwtest::WriterTest {
+protected:
+    std::string Chipwide() {
+        auto writer = MakeWriter();
+        writer->WriteChipwideModule();
+        return writer->GetMemoryText();
+    }
+    // The cell models written ahead of the modules.
+    std::string Models() {
+        params_.SetWriteInstantiatedTimcells(true);
+        params_.SetMHFMode(true);  // no module definitions
+        return AfterHead(View());
+    }
+};
+
+TEST_F(VerilogWriterLibrary, ChipwideIsCopiedInsideAGuard) {
+    root_.File(
+        "verilog/src/chipwide.v",
+        "// $Header: /lib/chipwide.v,v 1.2 $\nmodule chipwide;\n\n  wire GSR; // $Header: x\n"
+        "endmodule\n");
+    EXPECT_EQ(Chipwide(),
+              "\n`ifndef CHIPWIDE\n`define CHIPWIDE\nmodule chipwide;\n\nendmodule\n"
+              "\n`endif\n\n");
+}
+
+TEST_F(VerilogWriterLibrary, ChipwideComesFromTheFirstRootHoldingIt) {
+    TempDir r1, r2;
+    const std::string plainFile = r1.File("plain", "x");
+    r1.Dir("verilog/src");
+    r2.File("verilog/src/chipwide.v", "second\n");
+    root_.File("verilog/src/chipwide.v", "");
+    Port_MsgCapture capture;
+    vornix_.Set(
+        (plainFile + ":/no/such:" + r1.Path() + ":" + r2.Path() + ":" + root_.Path()).c_str());
+    EXPECT_EQ(Chipwide(), "\n`ifndef CHIPWIDE\n`define CHIPWIDE\nsecond\n\n`endif\n\n");
+    // An empty source still gets its guard.
+    vornix_.Set(root_.Path().c_str());
+    EXPECT_EQ(Chipwide(), "\n`ifndef CHIPWIDE\n`define CHIPWIDE\n\n`endif\n\n");
+    EXPECT_TRUE(capture.Texts(Port_MsgLevel::Warning).empty());
+}
+
+TEST_F(VerilogWriterLibrary, MissingChipwideIsReported) {
+    nlw_.SetIsVornixCore(true);
+    params_.SetFuncellMode(true);
+    {
+        Port_MsgCapture capture;
+        EXPECT_EQ(Chipwide(), "// synthesis translate_off\n// synthesis translate_on\n");
+        EXPECT_EQ(capture.Texts(Port_MsgLevel::Warning), Strings{kNoChipwide});
+        EXPECT_TRUE(capture.Texts(Port_MsgLevel::Error).empty());
+    }
+    vornix_.Set("");
+    Port_MsgCapture capture;
+    EXPECT_EQ(Chipwide(), "// synthesis translate_off\n// synthesis translate_on\n");
+    EXPECT_EQ(capture.Texts(Port_MsgLevel::Error), Strings{kNoVornix});
+    EXPECT_EQ(capture.Texts(Port_MsgLevel::Warning), Strings{kNoChipwide});
+}
+
+TEST_F(VerilogWriterLibrary, DeviceDataItemsBecomeMapEntries) {
+    root_.File("data/vdm2ver.acd",
+               "BigEndingTimcell = V_FOO, V_BAR:ADDR:DATA, v_bar:'A:B'\n"
+               "RecursiveInclusion = V_A:V_B:V_C, V_X\n");
+    Port_MsgCapture capture;
+    auto writer = MakeWriter();
+    EXPECT_EQ(
+        ToEntries(writer->GetBigEndingTimcellMap()),
+        (Entries{{"V_BAR", "ADDR"}, {"V_BAR", "DATA"}, {"V_FOO", "V_FOO"}, {"v_bar", "A:B"}}));
+    EXPECT_EQ(ToEntries(writer->GetRecursiveInclusionMap()),
+              (Entries{{"V_A", "V_B"}, {"V_A", "V_C"}, {"V_X", "V_X"}}));
+    EXPECT_EQ(capture.Texts(Port_MsgLevel::Debug),
+              (Strings{"Adding (V_A:V_B) to the recursive inclusion map.\n",
+                       "Adding (V_A:V_C) to the recursive inclusion map.\n"}));
+}
+
+TEST_F(VerilogWriterLibrary, ModelsAreCopiedOnceAtTheirFirstNeed) {
+    root_.File("data/vdm2ver.acd", "RecursiveInclusion = v_a:V_B:V_C, V_C\n");
+    for (const char* m : {"V_A", "V_B", "V_C"})
+        root_.File(std::string("verilog/src/timcells/") + m + ".v",
+                   std::string("// $Header: ") + m + "\nmodule " + m + ";\nendmodule\n");
+    Nlw_NlBlock* top = b_.CreateRoot(b_.AddModuleType("top"), "top");
+    Nlw_NlType* a = b_.AddLibraryType("V_A", true, false);
+    b_.CreateLeaf(top, b_.AddLibraryType("V_C", true, false), "c");
+    b_.CreateLeaf(top, a, "a1");
+    b_.CreateLeaf(top, a, "a2");
+    b_.CreateLeaf(top, b_.AddLibraryType("V_D", false, false), "d");
+    Port_MsgCapture capture;
+    nlwtest::ExpectGolden("library/models_once", Models());
+    EXPECT_TRUE(capture.Texts(Port_MsgLevel::Error).empty());
+    EXPECT_EQ(capture.Texts(Port_MsgLevel::Debug).back(),
+              "GetParams()->GetWriteInstantiatedTimcells() \n");
+}
+
+TEST_F(VerilogWriterLibrary, FunctionalModeLooksInFuncells) {
+    root_.File("verilog/src/timcells/V_T.v", "timing\n");
+    root_.File("verilog/src/funcells/V_T.v", "functional\n");
+    Nlw_NlBlock* top = b_.CreateRoot(b_.AddModuleType("top"), "top");
+    b_.CreateLeaf(top, b_.AddLibraryType("V_T", true, false), "t");
+    EXPECT_EQ(Models(), "timing\n\n");
+    params_.SetFuncellMode(true);
+    EXPECT_EQ(Models(), "functional\n\n");
+}
+
+TEST_F(VerilogWriterLibrary, MissingModelsAreReportedOncePerFile) {
+    // Lines longer than any read buffer are copied whole.
+    const std::string longLine(3000, 'x');
+    root_.File("verilog/src/timcells/V_OK.v", longLine + "\n");
+    Nlw_NlBlock* top = b_.CreateRoot(b_.AddModuleType("top"), "top");
+    Nlw_NlBlock* sub = b_.CreateMacro(top, b_.AddModuleType("sub"), "s");
+    Nlw_NlType* missing = b_.AddLibraryType("V_MISSING", true, false);
+    b_.CreateLeaf(top, missing, "m1");
+    b_.CreateLeaf(sub, missing, "m2");
+    b_.CreateLeaf(sub, b_.AddLibraryType("V_OK", false, true), "ok");
+    b_.CreateLeaf(top, b_.AddLibraryType("V_SKIP", true, false), "skip")
+        ->AddProperty(Vdm_Property::NewBool("NLW_NOT_INSTANTIATABLE", true));
+    {
+        Port_MsgCapture capture;
+        EXPECT_EQ(Models(), longLine + "\n\n");
+        EXPECT_EQ(capture.Texts(Port_MsgLevel::Error),
+                  Strings{"No module file found for model V_MISSING.\n"});
+    }
+    vornix_.Set("");
+    Port_MsgCapture capture;
+    EXPECT_EQ(Models(), "");
+    EXPECT_EQ(capture.Texts(Port_MsgLevel::Error),
+              (Strings{kNoVornix, "No module file found for model V_MISSING.\n", kNoVornix,
+                       "No module file found for model V_OK.\n"}));
 }
 
 }  // namespace

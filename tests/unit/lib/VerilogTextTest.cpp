@@ -1,10 +1,14 @@
-// Identifier escaping, bus range and index text, reserved words.
+// Identifier escaping, bus range and index text, reserved words, the name
+// legalizer and the usage texts.
+
 #include <gtest/gtest.h>
 
+#include <cstdio>
 #include <string>
 #include <vector>
 
 #include "Nlw_Verilog.h"
+#include "Nlw_VerilogLU.h"
 #include "TestFiles.h"
 #include "model/Nlw_NlBuilder.h"
 
@@ -48,8 +52,8 @@ TEST_F(VerilogText, RecognisesEscapedForms) {
         EXPECT_FALSE(nlw.IsEscaped(name)) << name;
 }
 
-// Marks its own escaped form and index text: Escape must ask through the
-// virtual operations.
+// Marks its own escaped form and index text: Escape and the legalizer must
+// ask through the virtual operations.
 class MarkedVerilog : public Nlw_Verilog {
 public:
     unsigned char IsEscaped(const char* name) override {
@@ -104,6 +108,112 @@ TEST(VerilogReservedWords, ListsTheKeywordsInOrder) {
     EXPECT_EQ(all[102], "xor");
     // The table is in alphabetical order; a swapped or misspelt word shows.
     for (size_t i = 1; i < all.size(); ++i) EXPECT_LT(all[i - 1], all[i]) << all[i];
+}
+
+// ---------------------------------------------------------------------------
+// The Verilog name legalizer: which names are legal and what the others
+// become, with and without escaping at write time.
+
+// A name is legal exactly when Legalize leaves it alone, and a legalized name
+// keeps its length.
+TEST(VerilogLU, LegalizesWhatTheOutputStyleCannotWrite) {
+    Nlw_NlBus::SetInputDelimiterType(4);
+    Nlw_Verilog nlw;
+    std::vector<nlwtest::Row> cases = nlwtest::Table("verilog_lu");
+    cases.push_back({"0", std::string(3000, '-') + "[5]", "1", std::string(3000, '_') + "[5]"});
+    for (const nlwtest::Row& c : cases) {
+        SCOPED_TRACE(c[1].substr(0, 20) + (c[2] == "1" ? " bused" : "") +
+                     (c[0] == "1" ? " escaping" : ""));
+        Nlw_VerilogLU lu(&nlw, nullptr, true, c[0] == "1", true, true, false);
+        const Port::String name(c[1].c_str());
+        EXPECT_EQ(lu.IsLegal(name, c[2] == "1"), c[1] == c[3]);
+        const Port::String result = lu.Legalize(name, c[2] == "1");
+        EXPECT_EQ(result.str(), c[3]);
+        EXPECT_EQ(result.length(), c[1].size());
+    }
+}
+
+// The legalizer too asks through the writer's virtual operations.
+TEST(VerilogLU, AsksTheWriterThroughItsVirtualOperations) {
+    MarkedVerilog marked;
+    Nlw_VerilogLU lu(&marked, nullptr, true, true, true, true, false);
+    EXPECT_TRUE(lu.IsLegal(Port::String("keep me"), false));
+    EXPECT_EQ(lu.Legalize(Port::String("keep me"), false).str(), "keep me");
+    EXPECT_EQ(lu.Legalize(Port::String("a b[2]"), true).str(), "a_b<i>");
+}
+
+// ---------------------------------------------------------------------------
+// Usage texts: the synopses the constructors store and the two help printers.
+
+TEST(VerilogUsage, EachApplicationHasItsSynopsis) {
+    Nlw_Verilog qdb2ver;
+    EXPECT_STREQ(qdb2ver.GetApplicationName(), "qdb2ver");
+    nlwtest::ExpectGolden("usage/qdb2ver_synopsis", qdb2ver.GetUsage());
+    nlwtest::ExpectGolden("usage/tessel_synopsis", Nlw_Verilog("tessel").GetUsage());
+}
+
+TEST(VerilogUsage, ConstructorsSetTheBusStyles) {
+    Nlw_NlBus::SetMultiDimensions(true);
+    Nlw_NlBus::SetInputDelimiterType(4);
+    Nlw_NlBus::SetOutputDelimiterType(7);
+    Nlw_Verilog nlw("tessel");
+    EXPECT_FALSE(Nlw_NlBus::GetMultiDimensions());
+    EXPECT_EQ(Nlw_NlBus::GetInputDelimiterType(), 7);
+    EXPECT_EQ(Nlw_NlBus::GetOutputDelimiterType(), 4);
+}
+
+TEST(VerilogUsage, GetHelpChoosesThePrinterByApplicationName) {
+    for (const nlwtest::Row& c : nlwtest::Table("help_printers")) {
+        Nlw_Verilog nlw(c[0].c_str());
+        const Nlw_NetlistWriter::HelpFunction expected =
+            c[1] == "1" ? &Nlw_Verilog::Help : &Nlw_Verilog::TesselHelp;
+        EXPECT_EQ(nlw.GetHelp(), expected) << c[0];
+    }
+    Nlw_Verilog byDefault;
+    EXPECT_EQ(byDefault.GetHelp(), &Nlw_Verilog::Help);
+}
+
+TEST(VerilogUsage, HelpIssuesTheOptionListLineByLine) {
+    Port_MsgCapture capture;
+    Nlw_Verilog::Help();
+    ASSERT_EQ(capture.msgs.size(), 26u);
+    EXPECT_EQ(capture.msgs[0].domain, "NetListWriters");
+    nlwtest::ExpectGolden("usage/qdb2ver_help",
+                          nlwtest::Joined(capture.Texts(Port_MsgLevel::Status)));
+}
+
+const std::vector<std::string> kTesselLines = {
+    "\n",
+    "Use \"tessel -h <netlist_type>\" to display netlist-specific options. \n",
+    "Valid netlist_types are: \n\n",
+    "    equivalence or ecn (display options for equivalence checking netlist)\n",
+    "    simulation  or sim (display options for simulation netlist)\n",
+    "    static      or sta (display options for static timing analysis netlist)\n\n",
+    "tessel extracts design data from the input file and generates netlist compatible with "
+    "supported equivalence checking, simulation or static timing analysis tools.\n\n",
+};
+
+// Tells on stderr when the status lines issued so far are the overview, so
+// that the dying process can be judged by its output.
+class OverviewSink : public Port_MsgSink {
+public:
+    void Receive(const Port_Msg& msg) override {
+        if (msg.level == Port_MsgLevel::Status) lines_.push_back(msg.text);
+        if (lines_ == kTesselLines) std::fputs("[overview complete]", stderr);
+    }
+
+private:
+    std::vector<std::string> lines_;
+};
+
+void RunTesselHelp() {
+    static OverviewSink sink;
+    Port_MsgManager::Instance().AddSink(&sink);
+    Nlw_Verilog::TesselHelp();
+}
+
+TEST(VerilogUsageDeathTest, TesselHelpIssuesTheOverviewAndExits) {
+    EXPECT_EXIT(RunTesselHelp(), ::testing::ExitedWithCode(0), "\\[overview complete\\]");
 }
 
 }  // namespace

@@ -1,4 +1,6 @@
-// Formatted text and the host string.
+// Formatted text, the host string, C-string helpers, wildcard matching,
+// path helpers and the name cache.
+
 #include <gtest/gtest.h>
 
 #include <string>
@@ -6,6 +8,7 @@
 
 #include "TestFiles.h"
 #include "port/Port.h"
+#include "port/UT.h"
 
 namespace {
 
@@ -77,6 +80,81 @@ TEST(HostString, SplitAtSeparatorsOutsideQuotes) {
         EXPECT_EQ(got, c[5]) << c[0];
     }
     EXPECT_TRUE(String::Split(nullptr, ":", true, "", "").empty());
+}
+
+// ---------------------------------------------------------------------------
+// C-string helpers, wildcard matching, path helpers and the name cache.
+
+TEST(UtStr, ComparisonsIgnoringCase) {
+    EXPECT_NE(UT_STR::Compare("a", "A"), 0);
+    EXPECT_EQ(UT_STR::ICompare("QDB", "qdb"), 0);
+    EXPECT_EQ(UT_STR::_ICompare("qda", "QDA"), 0);
+    EXPECT_LT(UT_STR::ICompare("abc", "ABD"), 0);
+    EXPECT_GT(UT_STR::ICompare("abcd", "ABC"), 0);
+    EXPECT_EQ(UT_STR::ICompare(nullptr, ""), 0);
+    EXPECT_NE(UT_STR::ICompare(nullptr, "x"), 0);
+    EXPECT_EQ(UT_STR::INCompare("DCM_ADV_x", "dcm_adv", 7), 0);
+    EXPECT_NE(UT_STR::INCompare("DCM_ADV_x", "dcm_adx", 7), 0);
+    EXPECT_EQ(UT_STR::INCompare("ab", "AB", 10), 0);  // both end before n
+    EXPECT_NE(UT_STR::INCompare("ab", "ABC", 10), 0);
+}
+
+TEST(UtStr, IMatchPatterns) {
+    for (const nlwtest::Row& c : nlwtest::Table("imatch"))
+        EXPECT_EQ(UT_STR::IMatch(c[0].c_str(), c[1].c_str()) != 0, c[2] == "1")
+            << c[0] << " ~ " << c[1];
+    EXPECT_EQ(UT_STR::IMatch(nullptr, "*"), 1);
+}
+
+TEST(UtStr, IMatchStaysFastOnHostileStars) {
+    // Exponential backtracking would never finish on this.
+    std::string text(20000, 'a');
+    std::string pattern;
+    for (int i = 0; i < 40; ++i) pattern += "*a";
+    pattern += "*b";
+    EXPECT_EQ(UT_STR::IMatch(text.c_str(), pattern.c_str()), 0);
+    text.back() = 'b';
+    EXPECT_EQ(UT_STR::IMatch(text.c_str(), pattern.c_str()), 1);
+}
+
+TEST(UtStr, FindStringAndGetToken) {
+    const char* text = "lib/cells/x.v";
+    EXPECT_EQ(UT_STR::FindString(text, "cells"), text + 4);
+    EXPECT_EQ(UT_STR::FindString(text, "none"), nullptr);
+    EXPECT_EQ(UT_STR::FindString(nullptr, "a"), nullptr);
+    for (const nlwtest::Row& c : nlwtest::Table("tokens")) {
+        std::string token = "stale";
+        EXPECT_EQ(UT_STR::GetToken(c[0].c_str(), token, c[1].c_str()), c[2][0]) << c[0];
+        EXPECT_EQ(token, c[3]) << c[0];
+    }
+}
+
+TEST(UtPath, BaseRootAndDirectory) {
+    for (const nlwtest::Row& c : nlwtest::Table("paths")) {
+        EXPECT_EQ(UT_PATH::GetBase(c[0].c_str()), c[1]) << c[0];
+        EXPECT_EQ(UT_PATH::GetRoot(c[0].c_str()), c[2]) << c[0];
+        EXPECT_STREQ(Port::FileName(c[0].c_str()).GetPath(), c[3].c_str()) << c[0];
+    }
+    EXPECT_EQ(UT_PATH::GetRoot(nullptr), "");
+    EXPECT_STREQ(Port::FileName(nullptr).GetPath(), "");
+    EXPECT_EQ(UT_PATH::InternalPath("c:\\work\\top.v"), "c:/work/top.v");
+    EXPECT_EQ(UT_PATH::ExternalPath("a/b/c.v"), "a/b/c.v");
+}
+
+TEST(NameCache, CountsEachNameAndKeepsEntriesInPlace) {
+    UT_NCH_CACHE cache;
+    EXPECT_EQ(cache.find("a"), nullptr);
+    UT_NCH_NAME* a = cache.add("a", 1);
+    EXPECT_EQ(a->GetCount(), 1);
+    EXPECT_EQ(cache.add("a", 1)->GetCount(), 2);
+    EXPECT_EQ(cache.add("A", 1)->GetCount(), 1);  // exact comparison
+    EXPECT_EQ(cache.add("", 1)->GetCount(), 1);
+    EXPECT_EQ(cache.size(), 3u);
+    // Enough names to make the table grow several times.
+    for (int i = 0; i < 5000; ++i) cache.add(vorform("name%d", i), 1);
+    EXPECT_EQ(cache.find("a"), a);
+    EXPECT_EQ(cache.add("a", 1)->GetCount(), 3);
+    EXPECT_STREQ(a->GetName(), "a");
 }
 
 }  // namespace

@@ -1,10 +1,8 @@
 // The timing file writer: names as the netlist writes them, SDF escaping,
 // hierarchy, time scale, value triples and the three ways of writing net
-// delays, against one golden file (tests/data/sdf/writer.golden; NLW_BLESS=1
-// writes it anew after a reviewed change).
+// delays, against one golden file.
 #include <gtest/gtest.h>
 
-#include <cstdlib>
 #include <string>
 
 #include "HostTestSupport.h"
@@ -14,9 +12,7 @@
 
 namespace {
 
-using hosttest::ReadFile;
 using hosttest::StubNetlistWriter;
-using hosttest::WriteFile;
 
 class SdfWriterTest : public ::testing::Test {
 protected:
@@ -111,23 +107,12 @@ TEST_F(SdfWriterTest, WritesWhatTheGoldenFileHolds) {
     timing_.nominal = true;
     out += "=== nominal delays say so\n" + Write(reg_->GetParent());
 
-    const std::string golden = std::string(NLW_TEST_DATA_DIR) + "/sdf/writer.golden";
-    if (std::getenv("NLW_BLESS")) WriteFile(golden, out);
-    EXPECT_EQ(out, ReadFile(golden));
+    nlwtest::ExpectGolden("sdf/writer", out);
 }
 
 TEST(SdfWriter, EscapesEveryCharacterOutsideIdentifiers) {
-    const struct {
-        const char* name;
-        const char* sdf;
-    } cases[] = {
-        {"plain_Name9", "plain_Name9"},
-        {"u1.r", "u1\\.r"},
-        {"$auto$ff.cc:266", "\\$auto\\$ff\\.cc\\:266"},
-        {"q[0]$sb_io", "q\\[0\\]\\$sb_io"},
-        {"a/b c\\d", "a\\/b\\ c\\\\d"},
-    };
-    for (const auto& c : cases) EXPECT_EQ(Nlw_SdfWriter::EscapeName(c.name), c.sdf) << c.name;
+    for (const nlwtest::Row& c : nlwtest::Table("sdf_names"))
+        EXPECT_EQ(Nlw_SdfWriter::EscapeName(c[0].c_str()), c[1]) << c[0];
 }
 
 }  // namespace
