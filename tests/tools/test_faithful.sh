@@ -37,8 +37,13 @@ done
 check "output buffer with an x input keeps the pin" has pfd.plain.v ".I(1'bx)"
 
 # --- Open and constant bits of outputs, inputs tied inside ---------------
-generic "$here/open_outputs.v" oo_base.json
-python3 "$tools/faithful/open_outputs.py" oo_base.json oo.json oo_gold.json
+# open_outputs.json: open_outputs.v through yosys (synth -lut 4), with the
+# bits other flows leave open or constant, which yosys does not write: the
+# sub-module's outputs open in part (y) or whole (z), an input bit tied
+# inside it, a cell output tied to a constant. The gold design has fresh
+# nets on the open and constant cell outputs, which is what they mean.
+cp "$here/open_outputs.json" oo.json
+cp "$here/open_outputs_gold.json" oo_gold.json
 for opts in "" "-fn" "-ne"; do
     net="oo$opts.v"
     check "open bits $opts: written" run 0 $q $opts oo.json "$net"
