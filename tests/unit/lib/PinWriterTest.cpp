@@ -1,15 +1,10 @@
 // The signal/pin map file: header, device lines, one padded line per pad
-// cell with its instance path, and the driver that writes it.
-#include <algorithm>
-
+// cell with its instance path (the run that writes it: test_programs.sh).
 #include "Nlw_PinWriter.h"
 #include "TestFiles.h"
 #include "VerilogWriterTest.h"
 
 namespace {
-
-using vwtest::ScopedEnv;
-using vwtest::TempDir;
 
 class PinWriter : public vwtest::WriterTest {
 protected:
@@ -25,7 +20,6 @@ protected:
         lut_ = b_.AddLibraryType("V_LUT1", false, false);
         b_.AddTypePin(lut_, "I0", NLW_DIR_INPUT);
         b_.AddTypePin(lut_, "O", NLW_DIR_OUTPUT);
-        top_ = b_.CreateRoot(b_.AddModuleType("top"), "top");
     }
 
     // A port of the macro joined to a new signal of the same name inside.
@@ -75,7 +69,6 @@ protected:
     Nlw_NlType* pad_ = nullptr;
     Nlw_NlType* obuf_ = nullptr;
     Nlw_NlType* lut_ = nullptr;
-    Nlw_NlBlock* top_ = nullptr;
 };
 
 TEST_F(PinWriter, WritesHeaderDeviceLinesAndOnePaddedLinePerPad) {
@@ -166,25 +159,6 @@ TEST_F(PinWriter, DeepHierarchyIsWalkedWhole) {
     }
     Pad(macro, "ib", Port(macro, "p", NLW_DIR_INPUT), "P1");
     EXPECT_EQ(Body(Pins()), vorform("%-20s\tINPUT     \tP1        \n", (path + "p").c_str()));
-}
-
-// The driver names the file after the output root, announces it and writes
-// it whole, with the names the legalizer gave.
-TEST_F(PinWriter, DriverWritesTheRootPinFile) {
-    TempDir dir;
-    ScopedEnv noCache("NLW_NO_NAMECACHE", nullptr);
-    params_.SetOutputFileName((dir.Path() + "/top.v").c_str());
-    params_.SetOutputFileMode(Port::Stream::Replace);
-    params_.SetInputFileType("qdb");
-    params_.SetWritePinFile(true);
-    Pad(top_, "ib", Port(top_, "rst", NLW_DIR_INPUT), "K3");
-    Port_MsgCapture capture;
-    nlw_.WriteDesign();
-    const std::string pinFile = dir.Path() + "/top.pin";
-    const std::vector<std::string> status = capture.Texts(Port_MsgLevel::Status);
-    EXPECT_NE(std::find(status.begin(), status.end(), "Writing pin file '" + pinFile + "' ...\n"),
-              status.end());
-    nlwtest::ExpectGolden("pin/driver", nlwtest::ReadFile(pinFile));
 }
 
 }  // namespace

@@ -43,8 +43,6 @@ const char* const kNoticeStart =
     "chipwide module to the simulation invocation command. ";
 class VerilogHeader : public vwtest::WriterTest {
 protected:
-    VerilogHeader() { top = b_.CreateRoot(b_.AddModuleType("top"), "top"); }
-
     std::string Header() {
         MemoryWriter writer(&nlw_);
         nlw_.WriteHeader(&writer);
@@ -56,8 +54,6 @@ protected:
             if (text.rfind(kNoticeStart, 0) == 0) ++count;
         return count;
     }
-
-    Nlw_NlBlock* top = nullptr;
 };
 
 TEST_F(VerilogHeader, WritesTheDisclaimerOfTheMode) {
@@ -74,30 +70,30 @@ TEST_F(VerilogHeader, ChipwideIsNeededForUndrivenGlobalsOrTheTopProperty) {
     EXPECT_FALSE(Peer::IsChipwideNeeded(nlw_));
 
     // A global set/reset that stands for a pin is provided by that pin.
-    Nlw_NlSignal* gsr = b_.AddSignal(top, "GSR");
+    Nlw_NlSignal* gsr = b_.AddSignal(top_, "GSR");
     b_.SetSetReset(gsr);
-    Nlw_NlPin* pin = b_.AddPort(top, "GSR_PORT", NLW_DIR_INPUT);
+    Nlw_NlPin* pin = b_.AddPort(top_, "GSR_PORT", NLW_DIR_INPUT);
     b_.SetRefPin(gsr, pin);
     EXPECT_FALSE(Peer::IsChipwideNeeded(nlw_));
 
     // An undriven global tristate without a pin needs the module.
-    Nlw_NlSignal* gts = b_.AddSignal(top, "GTS");
+    Nlw_NlSignal* gts = b_.AddSignal(top_, "GTS");
     b_.SetTristate(gts);
     EXPECT_TRUE(Peer::IsChipwideNeeded(nlw_));
 
     // Driven, it does not.
     Nlw_NlType* driverType = b_.AddLibraryType("DRV", true, false);
     b_.AddTypePin(driverType, "O", NLW_DIR_OUTPUT);
-    Nlw_NlBlock* driver = b_.CreateLeaf(top, driverType, "drv");
+    Nlw_NlBlock* driver = b_.CreateLeaf(top_, driverType, "drv");
     b_.Connect(driver->GetPin(0), gts);
     EXPECT_FALSE(Peer::IsChipwideNeeded(nlw_));
 
-    top->AddProperty(Vdm_Property::NewBool("NLW_CHIPWIDE_MODULE", true));
+    top_->AddProperty(Vdm_Property::NewBool("NLW_CHIPWIDE_MODULE", true));
     EXPECT_TRUE(Peer::IsChipwideNeeded(nlw_));
 }
 
 TEST_F(VerilogHeader, ChipwideNoticeOncePerHeadAndAtTheEnd) {
-    top->AddProperty(Vdm_Property::NewString("NLW_CHIPWIDE_MODULE", "1"));
+    top_->AddProperty(Vdm_Property::NewString("NLW_CHIPWIDE_MODULE", "1"));
     {
         Port_MsgCapture capture;
         Header();
@@ -136,7 +132,7 @@ TEST_F(VerilogHeader, ClosingNoticesNameTheSimulationLibrary) {
         Peer::PrintInfoMessage(nlw_);
         EXPECT_TRUE(capture.msgs.empty());
     }
-    b_.SetSetReset(b_.AddSignal(top, "GSR"));
+    b_.SetSetReset(b_.AddSignal(top_, "GSR"));
     {
         Port_MsgCapture capture;
         Peer::PrintInfoMessage(nlw_);
@@ -150,7 +146,7 @@ TEST_F(VerilogHeader, WriteParamsListsTheRun) {
     params_.SetInputFileName("in.qdb");
     params_.SetOutputFileName("out.v");
     params_.SetVornix("/opt/vx");
-    b_.CreateMacro(top, b_.AddModuleType("sub"), "u1");
+    b_.CreateMacro(top_, b_.AddModuleType("sub"), "u1");
     MemoryWriter writer(&nlw_);
     Peer::WriteParams(nlw_, &writer);
     nlwtest::ExpectGolden("header/write_params_lists_the_run", writer.GetMemoryText());
@@ -190,7 +186,6 @@ const char* const kNoLibrary =
 class VerilogWriterPreamble : public vwtest::WriterTest {
 protected:
     VerilogWriterPreamble() {
-        top_ = b_.CreateRoot(b_.AddModuleType("top"), "top");
         params_.SetInsert_chipwide(false);
         params_.SetCommandLine("qdb2ver -w top.qdb");
         params_.SetInputFileName("top.qdb");
@@ -203,8 +198,6 @@ protected:
         const size_t begin = text.find("// Purpose:");
         return text.substr(begin, text.find("`timescale") - begin);
     }
-
-    Nlw_NlBlock* top_ = nullptr;
 };
 
 // Header fields are user texts inside "//" comments: a line break in one
@@ -405,12 +398,11 @@ TEST_F(VerilogWriterLibrary, ModelsAreCopiedOnceAtTheirFirstNeed) {
     for (const char* m : {"V_A", "V_B", "V_C"})
         root_.File(std::string("verilog/src/timcells/") + m + ".v",
                    std::string("// $Header: ") + m + "\nmodule " + m + ";\nendmodule\n");
-    Nlw_NlBlock* top = b_.CreateRoot(b_.AddModuleType("top"), "top");
     Nlw_NlType* a = b_.AddLibraryType("V_A", true, false);
-    b_.CreateLeaf(top, b_.AddLibraryType("V_C", true, false), "c");
-    b_.CreateLeaf(top, a, "a1");
-    b_.CreateLeaf(top, a, "a2");
-    b_.CreateLeaf(top, b_.AddLibraryType("V_D", false, false), "d");
+    b_.CreateLeaf(top_, b_.AddLibraryType("V_C", true, false), "c");
+    b_.CreateLeaf(top_, a, "a1");
+    b_.CreateLeaf(top_, a, "a2");
+    b_.CreateLeaf(top_, b_.AddLibraryType("V_D", false, false), "d");
     Port_MsgCapture capture;
     nlwtest::ExpectGolden("library/models_once", Models());
     EXPECT_TRUE(capture.Texts(Port_MsgLevel::Error).empty());
@@ -421,8 +413,7 @@ TEST_F(VerilogWriterLibrary, ModelsAreCopiedOnceAtTheirFirstNeed) {
 TEST_F(VerilogWriterLibrary, FunctionalModeLooksInFuncells) {
     root_.File("verilog/src/timcells/V_T.v", "timing\n");
     root_.File("verilog/src/funcells/V_T.v", "functional\n");
-    Nlw_NlBlock* top = b_.CreateRoot(b_.AddModuleType("top"), "top");
-    b_.CreateLeaf(top, b_.AddLibraryType("V_T", true, false), "t");
+    b_.CreateLeaf(top_, b_.AddLibraryType("V_T", true, false), "t");
     EXPECT_EQ(Models(), "timing\n\n");
     params_.SetFuncellMode(true);
     EXPECT_EQ(Models(), "functional\n\n");
@@ -432,13 +423,12 @@ TEST_F(VerilogWriterLibrary, MissingModelsAreReportedOncePerFile) {
     // Lines longer than any read buffer are copied whole.
     const std::string longLine(3000, 'x');
     root_.File("verilog/src/timcells/V_OK.v", longLine + "\n");
-    Nlw_NlBlock* top = b_.CreateRoot(b_.AddModuleType("top"), "top");
-    Nlw_NlBlock* sub = b_.CreateMacro(top, b_.AddModuleType("sub"), "s");
+    Nlw_NlBlock* sub = b_.CreateMacro(top_, b_.AddModuleType("sub"), "s");
     Nlw_NlType* missing = b_.AddLibraryType("V_MISSING", true, false);
-    b_.CreateLeaf(top, missing, "m1");
+    b_.CreateLeaf(top_, missing, "m1");
     b_.CreateLeaf(sub, missing, "m2");
     b_.CreateLeaf(sub, b_.AddLibraryType("V_OK", false, true), "ok");
-    b_.CreateLeaf(top, b_.AddLibraryType("V_SKIP", true, false), "skip")
+    b_.CreateLeaf(top_, b_.AddLibraryType("V_SKIP", true, false), "skip")
         ->AddProperty(Vdm_Property::NewBool("NLW_NOT_INSTANTIATABLE", true));
     {
         Port_MsgCapture capture;

@@ -1,8 +1,6 @@
 // The test fixture writer: file head, port declarations, unit under test,
-// waveform dumps, the column header with its monitor and the stimulus.
-#include <algorithm>
-#include <fstream>
-#include <iterator>
+// waveform dumps, the column header with its monitor and the stimulus (the
+// run that writes it: test_programs.sh and the option rows).
 #include <string>
 #include <vector>
 
@@ -12,16 +10,13 @@
 
 namespace {
 
+using vwtest::kNoVornix;
 using vwtest::ScopedEnv;
 using vwtest::TempDir;
-
-using vwtest::kNoVornix;
 
 class VerilogTestWriter : public vwtest::WriterTest {
 protected:
     VerilogTestWriter() { params_.SetCommandLine("qdb2ver -tf top.json"); }
-
-    Nlw_NlBlock* Root() { return top_ = b_.CreateRoot(b_.AddModuleType("top"), "top"); }
 
     // The fixture module alone.
     std::string Fixture() {
@@ -72,13 +67,10 @@ protected:
         b.GetOrCreateNetwork(s)->AddProperty(Vdm_Property::NewInt("VL_FLOATVAL", floatVal));
         return s;
     }
-
-    Nlw_NlBlock* top_ = nullptr;
 };
 
 TEST_F(VerilogTestWriter, WholeFileOfASmallDesign) {
     const std::string chipwide = root_.File("verilog/src/chipwide.v", "module chipwide;\n");
-    Root();
     b_.AddPort(top_, "clk", NLW_DIR_INPUT);
     b_.AddPortBus(top_, "d", NLW_DIR_INPUT, 7, 0);
     b_.AddPort(top_, "q", NLW_DIR_OUTPUT);
@@ -102,7 +94,6 @@ TEST_F(VerilogTestWriter, IncludeComesFromTheFirstRootHoldingTheChipwideFile) {
                              dirs.Path() + "/dirAsFile:" + dirs.Path() + "/good:" + dirs.Path() +
                              "/later";
     ScopedEnv vornix("VORNIX", list.c_str());
-    Root();
     Port_MsgCapture capture;
     const std::string text = File();
     EXPECT_NE(text.find("\n\n`include \"" + good + "\"\n`timescale 1 ns/1 ps\n\n  module test;\n"),
@@ -113,7 +104,6 @@ TEST_F(VerilogTestWriter, IncludeComesFromTheFirstRootHoldingTheChipwideFile) {
 }
 
 TEST_F(VerilogTestWriter, NoIncludeWithoutTheChipwideFileOrWithoutRoots) {
-    Root();
     params_.SetWritePsTimePrecision(false);
     {
         // Roots without the file: silently no include.
@@ -139,7 +129,6 @@ TEST_F(VerilogTestWriter, NoIncludeWithoutTheChipwideFileOrWithoutRoots) {
 }
 
 TEST_F(VerilogTestWriter, HeadFieldsStayInsideTheirComments) {
-    Root();
     params_.SetCommandLine("qdb2ver \"x\nmodule evil;\"");
     const std::string text = File();
     EXPECT_NE(text.find("// Command: qdb2ver \"x module evil;\"\n"), std::string::npos) << text;
@@ -150,7 +139,6 @@ TEST_F(VerilogTestWriter, HeadFieldsStayInsideTheirComments) {
 // Declarations and the unit under test
 
 TEST_F(VerilogTestWriter, InputsAreRegistersAndEverythingElseWires) {
-    Root();
     b_.AddPort(top_, "i", NLW_DIR_INPUT);
     b_.AddPort(top_, "o", NLW_DIR_OUTPUT);
     b_.AddPort(top_, "io", NLW_DIR_INOUT);
@@ -167,7 +155,6 @@ TEST_F(VerilogTestWriter, InputsAreRegistersAndEverythingElseWires) {
 }
 
 TEST_F(VerilogTestWriter, OnlyGlobalsReachedThroughChipwideGetARegister) {
-    Root();
     Global(b_, true, 3, 0);
     Global(b_, false, 3, 0);
     nlwtest::ExpectGolden("testfixture/globals_through_chipwide", Fixture());
@@ -187,7 +174,6 @@ TEST_F(VerilogTestWriter, OnlyGlobalsReachedThroughChipwideGetARegister) {
 }
 
 TEST_F(VerilogTestWriter, UnitUnderTestNameAndPortMaps) {
-    Root();
     nlwtest::ExpectGolden("testfixture/no_ports", Fixture());
     b_.AddPortBus(top_, "d", NLW_DIR_INPUT, 1, 0);
     b_.AddPort(top_, "a-b", NLW_DIR_OUTPUT);
@@ -199,7 +185,6 @@ TEST_F(VerilogTestWriter, UnitUnderTestNameAndPortMaps) {
 // Waveform dumps
 
 TEST_F(VerilogTestWriter, DumpBlocksFollowTheOptionsShmFirst) {
-    Root();
     params_.SetOutputFileName("out/top.v");
     for (int dumps = 0; dumps < 4; ++dumps) {
         params_.SetWriteShm(dumps & 1);
@@ -209,7 +194,6 @@ TEST_F(VerilogTestWriter, DumpBlocksFollowTheOptionsShmFirst) {
 }
 
 TEST_F(VerilogTestWriter, DumpNamesAreEscapedInsideTheirStringLiterals) {
-    Root();
     params_.SetOutputFileName("run \"1\"\\x.v");
     params_.SetWriteShm(true);
     params_.SetWriteVcd(true);
@@ -223,7 +207,6 @@ TEST_F(VerilogTestWriter, DumpNamesAreEscapedInsideTheirStringLiterals) {
 // Column header and monitor
 
 TEST_F(VerilogTestWriter, BusColumnsAreTheHexDigitsOfTheBus) {
-    Root();
     int n = 0;
     for (const nlwtest::Row& c : nlwtest::Table("bus_columns")) {
         const Nlw_NlPinBus* bus = b_.AddPortBus(top_, vorform("b%d", n++), NLW_DIR_INPUT,
@@ -239,7 +222,6 @@ TEST_F(VerilogTestWriter, BusColumnsAreTheHexDigitsOfTheBus) {
 // escaped in the string literal and a percent sign doubled, so that each
 // prints as the one character of the name.
 TEST_F(VerilogTestWriter, ColumnHeaderAndMonitor) {
-    Root();
     b_.AddPortBus(top_, "d", NLW_DIR_INPUT, 7, 0);
     b_.AddPortBus(top_, "e", NLW_DIR_INPUT, 8, 0);
     b_.AddPortBus(top_, "f", NLW_DIR_OUTPUT, 0, 0);
@@ -254,7 +236,6 @@ TEST_F(VerilogTestWriter, ColumnHeaderAndMonitor) {
 }
 
 TEST_F(VerilogTestWriter, NamesLongerThanTheGridKeepTheirFirstCharacters) {
-    Root();
     std::string name(300, 'n');
     name[255] = 'E';
     name[256] = 'X';
@@ -293,32 +274,6 @@ TEST_F(VerilogTestWriter, StimulusDrivesTheGlobalsByConnection) {
         }
         nlwtest::ExpectGolden("testfixture/stimulus_" + c[0], Stimulus());
     }
-}
-
-// ---------------------------------------------------------------------------
-// Driver
-
-TEST_F(VerilogTestWriter, DriverWritesTheFixtureBesideTheNetlist) {
-    TempDir out;
-    ScopedEnv noCache("NLW_NO_NAMECACHE", "1");
-    Root();
-    b_.AddPort(top_, "a", NLW_DIR_INPUT);
-    const std::string netlist = out.Path() + "/top.v";
-    params_.SetOutputFileName(netlist.c_str());
-    params_.SetOutputFileMode(Port::Stream::Replace);
-    params_.SetInputFileType("json");
-    params_.SetWriteTestFile(true);
-    Port_MsgCapture capture;
-    nlw_.WriteDesign();
-
-    const std::string fixture = out.Path() + "/top.tv";
-    const std::vector<std::string> status = capture.Texts(Port_MsgLevel::Status);
-    EXPECT_NE(std::find(status.begin(), status.end(),
-                        "Writing Verilog test file '" + fixture + "' ...\n"),
-              status.end());
-    std::ifstream in(fixture);
-    const std::string text((std::istreambuf_iterator<char>(in)), std::istreambuf_iterator<char>());
-    EXPECT_NE(text.find("    top uut (\n      .a (a)\n    );\n"), std::string::npos) << text;
 }
 
 }  // namespace

@@ -17,7 +17,6 @@ protected:
     // top holds a1 (type A, port x), b1 (type B) and a2 (type A, port z), in
     // this order, so the macro list is top, a1, b1, a2.
     void BuildThreeMacros() {
-        top_ = b_.CreateRoot(b_.AddModuleType("top"), "top");
         Nlw_NlType* a = b_.AddModuleType("A");
         Nlw_NlBlock* a1 = b_.CreateMacro(top_, a, "a1");
         b_.AddPort(a1, "x", NLW_DIR_INPUT);
@@ -26,7 +25,6 @@ protected:
         b_.AddPort(a2_, "z", NLW_DIR_INPUT);
     }
 
-    Nlw_NlBlock* top_ = nullptr;
     Nlw_NlBlock* a2_ = nullptr;
 };
 
@@ -94,15 +92,10 @@ TEST_F(VerilogWriterModules, AkaCommentFollowsTheOpeningParenthesis) {
 // ---------------------------------------------------------------------------
 // Port lists and declarations, wire declarations and the assign statement.
 
-class VerilogWriterPorts : public vwtest::WriterTest {
-protected:
-    Nlw_NlBlock* Root(const char* name = "m") {
-        return b_.CreateRoot(b_.AddModuleType(name), name);
-    }
-};
+using VerilogWriterPorts = vwtest::WriterTest;
 
 TEST_F(VerilogWriterPorts, ScalarsComeBeforeBusesWhateverThePinOrder) {
-    Nlw_NlBlock* m = Root();
+    Nlw_NlBlock* m = top_;
     b_.AddPort(m, "a", NLW_DIR_INPUT);
     b_.AddPortBus(m, "d", NLW_DIR_INPUT, 3, 0);
     b_.AddPort(m, "y", NLW_DIR_OUTPUT);
@@ -114,12 +107,12 @@ TEST_F(VerilogWriterPorts, ScalarsComeBeforeBusesWhateverThePinOrder) {
 }
 
 TEST_F(VerilogWriterPorts, UntypedPortIsListedButNotDeclared) {
-    Nlw_NlBlock* m = Root();
+    Nlw_NlBlock* m = top_;
     Nlw_NlPin* u = b_.AddPort(m, "u", NLW_DIR_UNTYPED);
     b_.AddPort(m, "a", NLW_DIR_INPUT);
     Nlw_NlPinBus* ub = b_.AddPortBus(m, "ub", NLW_DIR_UNTYPED, 1, 0);
     Port_MsgCapture capture;
-    EXPECT_EQ(Module(m), "module m (\n  u, a, ub\n);\n  input a;\nendmodule\n\n");
+    EXPECT_EQ(Module(m), "module top (\n  u, a, ub\n);\n  input a;\nendmodule\n\n");
     EXPECT_EQ(
         capture.Texts(Port_MsgLevel::Internal),
         (std::vector<std::string>{"Nlw_VerilogWriter: Notype " + u->ToString() + " detected.\n",
@@ -127,14 +120,14 @@ TEST_F(VerilogWriterPorts, UntypedPortIsListedButNotDeclared) {
 }
 
 TEST_F(VerilogWriterPorts, PortLineOnlyWithPortsAndIndentedForBusesAlone) {
-    Nlw_NlBlock* m = Root();
-    EXPECT_EQ(Module(m), "module m (\n);\nendmodule\n\n");
+    Nlw_NlBlock* m = top_;
+    EXPECT_EQ(Module(m), "module top (\n);\nendmodule\n\n");
     b_.AddPortBus(m, "d", NLW_DIR_OUTPUT, 1, 0);
-    EXPECT_EQ(Module(m), "module m (\n  d\n);\n  output [1 : 0] d;\nendmodule\n\n");
+    EXPECT_EQ(Module(m), "module top (\n  d\n);\n  output [1 : 0] d;\nendmodule\n\n");
 }
 
 TEST_F(VerilogWriterPorts, AkaCommentsOnlyWhenAsked) {
-    Nlw_NlBlock* m = Root();
+    Nlw_NlBlock* m = top_;
     b_.AddPort(m, "a", NLW_DIR_INPUT)->SetAka("A_orig");
     b_.AddPortBus(m, "d", NLW_DIR_INPUT, 1, 0)->SetAka("D_orig");
     b_.AddSignal(m, "n")->SetAka("N_orig");
@@ -145,7 +138,7 @@ TEST_F(VerilogWriterPorts, AkaCommentsOnlyWhenAsked) {
 }
 
 TEST_F(VerilogWriterPorts, WiresListScalarsBeforeBuses) {
-    Nlw_NlBlock* m = Root();
+    Nlw_NlBlock* m = top_;
     b_.AddSignal(m, "n1");
     b_.AddSignalBus(m, "bus", 3, 0);
     b_.SetVisible(b_.AddSignal(m, "hidden"), false);
@@ -157,7 +150,7 @@ TEST_F(VerilogWriterPorts, WiresListScalarsBeforeBuses) {
 }
 
 TEST_F(VerilogWriterPorts, AssignJoinsPortsToDifferentlyNamedNets) {
-    Nlw_NlBlock* m = Root();
+    Nlw_NlBlock* m = top_;
     Nlw_NlType* drv = b_.AddLibraryType("DRV", true, false);
     b_.AddTypePin(drv, "O", NLW_DIR_OUTPUT);
     // Ports that are neither inputs nor outputs need a driver on their net;
@@ -177,7 +170,7 @@ TEST_F(VerilogWriterPorts, AssignJoinsPortsToDifferentlyNamedNets) {
 // A port on its own net takes no part; a global signal is written unescaped;
 // a bus bit keeps its index outside the escape.
 TEST_F(VerilogWriterPorts, AssignWritesGlobalsUnescapedAndBitIndexesOutside) {
-    Nlw_NlBlock* m = Root();
+    Nlw_NlBlock* m = top_;
     b_.ConnectChild(b_.AddPort(m, "a", NLW_DIR_INPUT), b_.AddSignal(m, "a"));
     Nlw_NlSignal* gsr = b_.AddSignal(m, "chipwide.GSR");
     gsr->AddProperty(Vdm_Property::NewBool("NLW_GLOBAL_SIGNAL", true));
@@ -194,8 +187,6 @@ TEST_F(VerilogWriterPorts, AssignWritesGlobalsUnescapedAndBitIndexesOutside) {
 
 class VerilogWriterInstances : public vwtest::WriterTest {
 protected:
-    VerilogWriterInstances() { top_ = b_.CreateRoot(b_.AddModuleType("top"), "top"); }
-
     // A cell with the scalar pins A, B, Y around the bus D[1:0].
     Nlw_NlType* Cell(const char* name) {
         Nlw_NlType* t = b_.AddLibraryType(name, true, false);
@@ -233,7 +224,6 @@ protected:
         return text.substr(begin, text.rfind("endmodule") - begin);
     }
 
-    Nlw_NlBlock* top_ = nullptr;
     Nlw_NlBus* a_ = nullptr;
     Nlw_NlBus* d_ = nullptr;
 };
@@ -322,7 +312,6 @@ TEST_F(VerilogWriterInstances, MacroChildrenAreInstantiatedByPort) {
 class VerilogWriterParams : public vwtest::WriterTest {
 protected:
     VerilogWriterParams() {
-        top_ = b_.CreateRoot(b_.AddModuleType("top"), "top");
         lut_ = b_.AddLibraryType("V_LUT4", true, false);
         b_.AddTypePin(lut_, "O", NLW_DIR_OUTPUT);
     }
@@ -346,7 +335,6 @@ protected:
         return writer->GetMemoryText();
     }
 
-    Nlw_NlBlock* top_ = nullptr;
     Nlw_NlType* lut_ = nullptr;
 };
 

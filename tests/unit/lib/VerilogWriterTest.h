@@ -29,8 +29,8 @@ const char* const kNoVornix =
     " The VORNIX environment variable must be set for this program towork. Please check your "
     "environment to ensure that it is setup properly to use the Vornix tools\n";
 
-// Everything a writer needs, with an empty installation root: no device
-// data, no property filter, no library sources.
+// Everything a writer needs, with an empty installation root (no device
+// data, no property filter, no library sources) and a root instance top.
 class WriterTest : public ::testing::Test {
 protected:
     WriterTest()
@@ -65,6 +65,7 @@ protected:
     ScopedEnv vornix_, stamp_, defparm_, oldPfd_, noSdf_;
     Nlw_NlView view_;
     Nlw_NlBuilder b_{&view_};
+    Nlw_NlBlock* top_ = b_.CreateRoot(b_.AddModuleType("top"), "top");
     Nlw_Params params_;
     Nlw_Design design_{"demo"};
     Nlw_Verilog nlw_;

@@ -62,14 +62,28 @@ struct Loaded {
     Nlw_NlBlock* root() const { return view->GetRootMacro(); }
 };
 
-inline Loaded LoadText(const std::string& json, Nlw_ReadOptions options = {},
-                       const char* name = "test.json") {
+// Loads through read, which is given the view and design to fill.
+template <typename Read>
+Loaded Load(Read read) {
     Loaded l;
     Port_MsgCapture capture;
-    l.ok = Nlw_JsonReader::LoadText(json, name, options, *l.view, l.design);
+    l.ok = read(*l.view, l.design);
     l.errors = capture.Texts(Port_MsgLevel::Error);
     l.warnings = capture.Texts(Port_MsgLevel::Warning);
     return l;
+}
+
+inline Loaded LoadText(const std::string& json, Nlw_ReadOptions options = {},
+                       const char* name = "test.json") {
+    return Load([&](Nlw_NlView& view, std::unique_ptr<Nlw_Design>& design) {
+        return Nlw_JsonReader::LoadText(json, name, options, view, design);
+    });
+}
+
+inline Loaded LoadFile(const std::string& path, Nlw_ReadOptions options = {}) {
+    return Load([&](Nlw_NlView& view, std::unique_ptr<Nlw_Design>& design) {
+        return Nlw_JsonReader::Load(path.c_str(), options, view, design);
+    });
 }
 
 // The loaded design and the load's messages, for a golden file.
@@ -78,15 +92,6 @@ inline std::string Text(const Loaded& l) {
     for (const std::string& e : l.errors) out += "error: " + e;
     for (const std::string& w : l.warnings) out += "warning: " + w;
     return out;
-}
-
-inline Loaded LoadFile(const std::string& path, Nlw_ReadOptions options = {}) {
-    Loaded l;
-    Port_MsgCapture capture;
-    l.ok = Nlw_JsonReader::Load(path.c_str(), options, *l.view, l.design);
-    l.errors = capture.Texts(Port_MsgLevel::Error);
-    l.warnings = capture.Texts(Port_MsgLevel::Warning);
-    return l;
 }
 
 inline bool HaveYosys() {
