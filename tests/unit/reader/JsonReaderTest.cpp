@@ -289,6 +289,25 @@ TEST_F(JsonReaderBadInput, SurvivesDeepNestingAndOddDocuments) {
 }
 
 // ---------------------------------------------------------------------------
+// Netlists yosys 0.23 wrote from small designs (tests/data/verilog, each
+// script in tests/data/yosys/README), compared whole: buses of both
+// directions and ranges, constant ports inside and out, a port on another
+// port's net, lookup tables of every width with their input buses, a
+// blackbox module as a cell type with its parameters, and a two-level design
+// flattened by yosys (hdlname akas) or by the reader.
+TEST_F(WithTestCells, ReadsWhatYosysWrites) {
+    for (const char* name : {"bus_design", "luts", "blackbox", "two_levels_flat", "two_levels"}) {
+        Loaded l = LoadFile(std::string(NLW_TEST_DATA_DIR) + "/yosys/" + name + ".json");
+        ASSERT_TRUE(l.ok) << name;
+        nlwtest::ExpectGolden(std::string("yosys/") + name, Text(l));
+    }
+    Nlw_ReadOptions flatten;
+    flatten.flatten = true;
+    Loaded l = LoadFile(NLW_TEST_DATA_DIR "/yosys/two_levels.json", flatten);
+    nlwtest::ExpectGolden("yosys/two_levels_flattened", Text(l));
+}
+
+// ---------------------------------------------------------------------------
 // Corrupted design files: every mutation of a valid file either loads or is
 // refused with exactly one error; none crashes, hangs or half-fills the view.
 

@@ -1,5 +1,5 @@
 // Helpers of the design reader tests: loading JSON text or files, a private
-// installation with chosen data files, running yosys, and model lookups.
+// installation with chosen data files, and model lookups.
 #pragma once
 
 #include <gtest/gtest.h>
@@ -94,34 +94,10 @@ inline std::string Text(const Loaded& l) {
     return out;
 }
 
-inline bool HaveYosys() {
-    static const int status = std::system("yosys -V >/dev/null 2>&1");
-    return status == 0;
-}
-
-// Synthesizes Verilog with yosys into a netlist JSON file in dir; script is
-// the yosys commands run between reading and writing.
-inline std::string Synthesize(const TempDir& dir, const std::string& verilog,
-                              const std::string& script) {
-    WriteFile(dir / "design.v", verilog);
-    std::string json = dir / "design.json";
-    std::string cmd = "cd '" + dir.path() + "' && yosys -q -p 'read_verilog design.v; " + script +
-                      "; write_json design.json' > yosys.log 2>&1";
-    EXPECT_EQ(std::system(cmd.c_str()), 0) << ReadFile(dir / "yosys.log");
-    return json;
-}
-
 // Lookups by writable name; linear, for tests only.
 inline Nlw_NlBlock* Child(const Nlw_NlBlock* parent, const std::string& name) {
     for (Nlw_NlBlock* c : parent->GetChildren())
         if (name == c->GetInstanceName()) return c;
-    return nullptr;
-}
-
-inline Nlw_NlPinBus* PinBus(const Nlw_NlBlock* block, const std::string& name) {
-    if (const UT_DARRAY<Nlw_NlPinBus*>* buses = block->GetPinBuses())
-        for (Nlw_NlPinBus* b : *buses)
-            if (name == b->GetWritableName()) return b;
     return nullptr;
 }
 
@@ -130,19 +106,6 @@ inline std::string NetOf(const Nlw_NlBlock* block, const std::string& pin) {
     Nlw_NlPin* p = block->GetPinByAlias(pin.c_str());
     if (!p) return "<no pin " + pin + ">";
     return p->GetSignal() ? p->GetSignal()->GetWritableName() : "";
-}
-
-// The name of a port's inside signal, "" when none.
-inline std::string InsideOf(const Nlw_NlBlock* macro, const std::string& port) {
-    Nlw_NlPin* p = macro->GetPinByAlias(port.c_str());
-    if (!p) return "<no port " + port + ">";
-    return p->GetChildSignal() ? p->GetChildSignal()->GetWritableName() : "";
-}
-
-inline int TieOf(const Nlw_NlBlock* block, const std::string& pin) {
-    Nlw_NlPin* p = block->GetPinByAlias(pin.c_str());
-    const Vdm_Property* t = p ? p->GetPropertyByName("TIEOFF") : nullptr;
-    return t ? t->GetInt32() : -1;
 }
 
 inline bool Contains(const std::string& text, const std::string& part) {
