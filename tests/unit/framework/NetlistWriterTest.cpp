@@ -15,13 +15,7 @@
 
 namespace {
 
-using hosttest::EnvSetting;
-using hosttest::MakeDirs;
-using hosttest::PlainWriter;
-using hosttest::QuietCapture;
-using hosttest::StubNetlistWriter;
-using hosttest::TempDir;
-using hosttest::WriteFile;
+using namespace hosttest;
 
 // "CELL:PARAM:TYPE:DEFAULT" per definition, in table order.
 std::vector<std::string> Dump(const Nlw_NetlistWriter& nlw) {

@@ -15,13 +15,7 @@
 
 namespace {
 
-using hosttest::Exists;
-using hosttest::ListDir;
-using hosttest::PlainWriter;
-using hosttest::QuietCapture;
-using hosttest::ReadFile;
-using hosttest::TempDir;
-using hosttest::WriteFile;
+using namespace hosttest;
 
 void WriteSample(Nlw_Writer& w) {
     w.WriteL("module top (a);");

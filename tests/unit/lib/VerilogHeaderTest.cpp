@@ -24,10 +24,7 @@ struct Nlw_VerilogTestPeer {
 namespace {
 
 using Peer = Nlw_VerilogTestPeer;
-using vwtest::AfterHead;
-using vwtest::kNoVornix;
-using vwtest::ScopedEnv;
-using vwtest::TempDir;
+using namespace vwtest;
 
 // A writer that keeps its text in memory.
 class MemoryWriter : public Nlw_Writer {

@@ -10,9 +10,7 @@
 
 namespace {
 
-using vwtest::kNoVornix;
-using vwtest::ScopedEnv;
-using vwtest::TempDir;
+using namespace vwtest;
 
 class VerilogTestWriter : public vwtest::WriterTest {
 protected:

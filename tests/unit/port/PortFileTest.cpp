@@ -13,11 +13,7 @@
 
 namespace {
 
-using hosttest::EnvSetting;
-using hosttest::MakeDirs;
-using hosttest::QuietCapture;
-using hosttest::TempDir;
-using hosttest::WriteFile;
+using namespace hosttest;
 
 std::vector<std::string> LinesInPieces(const std::string& path, int size) {
     Port::Stream stream(Port::Stream::Read, 4096);
