@@ -93,11 +93,8 @@ TEST_F(VerilogTestWriter, IncludeComesFromTheFirstRootHoldingTheChipwideFile) {
                              "/later";
     ScopedEnv vornix("VORNIX", list.c_str());
     Port_MsgCapture capture;
-    const std::string text = File();
-    EXPECT_NE(text.find("\n\n`include \"" + good + "\"\n`timescale 1 ns/1 ps\n\n  module test;\n"),
-              std::string::npos)
-        << text;
-    EXPECT_EQ(text.find("later"), std::string::npos);
+    nlwtest::ExpectGolden("testfixture/include_first_root",
+                          nlwtest::Replaced(File(), good, "<good>"));
     EXPECT_TRUE(capture.msgs.empty());
 }
 
@@ -106,19 +103,14 @@ TEST_F(VerilogTestWriter, NoIncludeWithoutTheChipwideFileOrWithoutRoots) {
     {
         // Roots without the file: silently no include.
         Port_MsgCapture capture;
-        const std::string text = File();
-        EXPECT_EQ(text.find("`include"), std::string::npos);
-        EXPECT_NE(text.find("///\n\n`timescale 1 ns/10 ps\n\n  module test;\n"), std::string::npos)
-            << text;
+        nlwtest::ExpectGolden("testfixture/no_include", File());
         EXPECT_TRUE(capture.msgs.empty());
     }
     {
         // No roots at all: an error, and the file goes on.
         ScopedEnv vornix("VORNIX", "");
         Port_MsgCapture capture;
-        const std::string text = File();
-        EXPECT_EQ(text.find("`include"), std::string::npos);
-        EXPECT_NE(text.find("  endmodule\n"), std::string::npos);
+        nlwtest::ExpectGolden("testfixture/no_include", File());
         ASSERT_EQ(capture.msgs.size(), 1u);
         EXPECT_EQ(capture.msgs[0].level, Port_MsgLevel::Error);
         EXPECT_EQ(capture.msgs[0].domain, "NetListWriters");
@@ -128,9 +120,7 @@ TEST_F(VerilogTestWriter, NoIncludeWithoutTheChipwideFileOrWithoutRoots) {
 
 TEST_F(VerilogTestWriter, HeadFieldsStayInsideTheirComments) {
     params_.SetCommandLine("qdb2ver \"x\nmodule evil;\"");
-    const std::string text = File();
-    EXPECT_NE(text.find("// Command: qdb2ver \"x module evil;\"\n"), std::string::npos) << text;
-    EXPECT_EQ(text.find("\nmodule evil"), std::string::npos);
+    nlwtest::ExpectGolden("testfixture/head_fields_in_comments", File());
 }
 
 // ---------------------------------------------------------------------------
