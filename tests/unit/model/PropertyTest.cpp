@@ -4,6 +4,7 @@
 #include <string>
 
 #include "HostTestSupport.h"
+#include "ModelText.h"
 #include "framework/Nlw_Util.h"
 #include "model/Nlw_Nl.h"
 #include "model/Vdm_Property.h"
@@ -12,28 +13,16 @@
 namespace {
 
 TEST(VdmProperty, TypesAndTexts) {
-    struct Case {
-        Vdm_Property* p;
-        int type;
-        const char* typeName;
-        const char* text;  // only strings and bit vectors have one
-    };
-    const Case cases[] = {
-        {Vdm_Property::NewBool("B", true), 0, "bool", nullptr},
-        {Vdm_Property::NewFloat("F", 2.5), 1, "float", nullptr},
-        {Vdm_Property::NewInt("I", -7), 3, "integer", nullptr},
-        {Vdm_Property::NewString("S", "text"), 9, "string", "text"},
-        {Vdm_Property::NewTypeDef("INIT", {"16'h0000", "x"}), 10, "typedef", nullptr},
-        {Vdm_Property::NewList("L"), 11, "list", nullptr},
-        {Vdm_Property::NewBits("V", "01xz"), 12, "bits", "01xz"},
-        {new Vdm_Property("O", 42), 42, "unknown", nullptr},
-    };
-    for (const Case& c : cases) {
-        std::unique_ptr<Vdm_Property> owned(c.p);
-        EXPECT_EQ(c.p->GetType(), c.type) << c.typeName;
-        EXPECT_STREQ(c.p->GetPropertyTypeName(), c.typeName);
-        EXPECT_STREQ(c.p->GetString(), c.text) << c.typeName;
+    for (const nlwtest::Row& c : nlwtest::Table("property_types")) {
+        std::unique_ptr<Vdm_Property> p(nlwtest::NewProperty(c[0], "P", c[1]));
+        EXPECT_EQ(p->GetType(), std::stoi(c[2])) << c[3];
+        EXPECT_STREQ(p->GetPropertyTypeName(), c[3].c_str());
+        EXPECT_STREQ(p->GetString(), nlwtest::Opt(c[4])) << c[3];
     }
+    Vdm_Property unknown("O", 42);
+    EXPECT_EQ(unknown.GetType(), 42);
+    EXPECT_STREQ(unknown.GetPropertyTypeName(), "unknown");
+    EXPECT_EQ(unknown.GetString(), nullptr);
 }
 
 TEST(VdmProperty, ListsOwnOrBorrowTheirElements) {
