@@ -177,9 +177,6 @@ TEST_F(VerilogHeader, FileNamesDeriveFromTheNetlistName) {
 // ---------------------------------------------------------------------------
 // File heads, the library search and the timing annotation statement.
 
-const char* const kNoLibrary =
-    "Timcell library directory not found, the `uselib constructis omitted for the -ul option.\n";
-
 class VerilogWriterPreamble : public vwtest::WriterTest {
 protected:
     VerilogWriterPreamble() {
@@ -240,33 +237,24 @@ TEST_F(VerilogWriterPreamble, LibrarySearchTakesTheFirstRootHoldingTheDirectory)
     r2.Dir("verilog/src/timcells");
     r2.Dir("verilog/src/funcells");
     r3.Dir("verilog/src/timcells");
-    struct Case {
-        std::string roots;
-        bool funcell;
-        std::string line;  // empty: none found
-        std::vector<std::string> errors;
-    };
-    const Case cases[] = {
-        {plainFile + ":/no/such/dir:" + r1.Path() + ":" + r2.Path() + ":" + r3.Path(),
-         false,
-         "`uselib dir=" + r2.Path() + "/verilog/src/timcells libext=.v\n",
-         {}},
-        {r3.Path() + ":" + r2.Path(),
-         true,
-         "`uselib dir=" + r2.Path() + "/verilog/src/funcells libext=.v\n",
-         {}},
-        {r1.Path(), false, "", {kNoLibrary}},
-        {"", false, "", {kNoVornix, kNoLibrary}},
-    };
-    for (const Case& c : cases) {
-        vornix_.Set(c.roots.c_str());
-        params_.SetFuncellMode(c.funcell);
+    std::string out;
+    for (const nlwtest::Row& c : nlwtest::Table("library_search")) {
+        std::string roots = c[0];
+        for (auto [tag, path] : {std::pair{"<plain>", plainFile},
+                                 {"<r1>", r1.Path()},
+                                 {"<r2>", r2.Path()},
+                                 {"<r3>", r3.Path()}})
+            roots = nlwtest::Replaced(roots, tag, path);
+        vornix_.Set(roots.c_str());
+        params_.SetFuncellMode(c[1] == "1");
         Port_MsgCapture capture;
         const std::string text = View();
-        EXPECT_NE(text.find("`timescale 1 ns/1 ps\n" + c.line + "\nmodule top"), std::string::npos)
-            << c.roots;
-        EXPECT_EQ(capture.Texts(Port_MsgLevel::Error), c.errors) << c.roots;
+        const size_t from = text.find("`timescale"), to = text.find("module top");
+        out += c[0] + " " + c[1] + ":\n" +
+               nlwtest::Replaced(text.substr(from, to - from), r2.Path(), "<r2>");
+        for (const std::string& e : capture.Texts(Port_MsgLevel::Error)) out += "error: " + e;
     }
+    nlwtest::ExpectGolden("preamble/library_search", out);
 }
 
 TEST_F(VerilogWriterPreamble, SdfAnnotateNeedsPropertyOptionAndEnvironment) {
