@@ -127,29 +127,20 @@ TEST(Writer, UnwritablePlacesGiveOneErrorAndNoFile) {
     TempDir dir;
     WriteFile(dir / "plain", "x");
     hosttest::MakeDirs(dir / "sub");
-    struct Case {
-        std::string path;
-        Port::Stream::Access access;
-        const char* reason;
-    };
-    const Case cases[] = {
-        {dir / "missing/top.v", Port::Stream::Create, "No such file or directory"},
-        {dir / "plain/top.v", Port::Stream::Replace, "Not a directory"},
-        {dir / "sub", Port::Stream::Replace, "Is a directory"},
-        {"", Port::Stream::Replace, "no file name was given"},
-        {dir / "read.v", Port::Stream::Read, "the file is not opened for writing"},
-    };
-    for (const Case& c : cases) {
+    for (const nlwtest::Row& c : nlwtest::Table("unwritable")) {
+        const std::string path = c[0].empty() ? "" : dir / c[0];
+        const Port::Stream::Access access = c[1] == "c"      ? Port::Stream::Create
+                                            : c[1] == "read" ? Port::Stream::Read
+                                                             : Port::Stream::Replace;
         QuietCapture capture;
         {
-            PlainWriter w(nullptr, c.path.c_str(), c.access);
-            EXPECT_FALSE(w.IsOk()) << c.path;
+            PlainWriter w(nullptr, path.c_str(), access);
+            EXPECT_FALSE(w.IsOk()) << path;
             WriteSample(w);
             EXPECT_FALSE(w.Close());
         }
-        EXPECT_EQ(
-            capture.Texts(Port_MsgLevel::Error),
-            std::vector<std::string>{"Cannot write file '" + c.path + "': " + c.reason + "\n"});
+        EXPECT_EQ(capture.Texts(Port_MsgLevel::Error),
+                  std::vector<std::string>{"Cannot write file '" + path + "': " + c[2] + "\n"});
         EXPECT_EQ(capture.msgs.size(), 1u);
     }
     EXPECT_EQ(ListDir(dir.path()), "plain\nsub\n");
