@@ -132,25 +132,13 @@ TEST_F(JsonReaderHierarchy, FlattensIntoLeavesOfTheTopNamedByPath) {
 }
 
 TEST_F(JsonReaderHierarchy, ChoosesTheTopModule) {
-    const std::string twoFree = nlwtest::Data("json/two_free_modules.json");
-    const std::string parentChild = nlwtest::Data("json/parent_child.json");
-    struct Case {
-        const std::string& json;
-        const char* top;  // the option
-        const char* chosen;
-    } cases[] = {
-        {twoFree, nullptr, "b"},      // the "top" attribute
-        {twoFree, "a", "a"},          // the option wins
-        {parentChild, nullptr, "p"},  // the one module nothing instantiates
-        {parentChild, "c", "c"},
-    };
-    for (const Case& c : cases) {
+    for (const nlwtest::Row& c : nlwtest::Table("top_module")) {
         Nlw_ReadOptions opt;
-        opt.top = c.top;
-        Loaded l = LoadText(c.json, opt);
+        opt.top = nlwtest::Opt(c[1]);
+        Loaded l = LoadText(nlwtest::Data("json/" + c[0]), opt);
         ASSERT_TRUE(l.ok) << l.errors[0];
-        EXPECT_STREQ(l.root()->GetTypeName(), c.chosen);
-        EXPECT_STREQ(l.design->GetName(), c.chosen);
+        EXPECT_EQ(l.root()->GetTypeName(), c[2]);
+        EXPECT_EQ(l.design->GetName(), c[2]);
     }
 }
 
