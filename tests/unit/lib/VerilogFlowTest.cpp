@@ -77,45 +77,25 @@ TEST_F(VerilogFlow, SingleModeWritesTheNetlistThenTheNotices) {
     EXPECT_EQ(Nlw_NlBus::GetInputDelimiterType(), 4);
 }
 
-struct LegalizeCase {
-    const char* env;  // set while writing; null: none
-    bool escaped;
-    const char* spacedName;
-    const char* aka;  // null: none kept
-    const char* dashedName;
-};
-
-class VerilogFlowLegalize : public VerilogFlow,
-                            public ::testing::WithParamInterface<LegalizeCase> {};
+class VerilogFlowLegalize : public VerilogFlow, public ::testing::WithParamInterface<int> {};
 
 TEST_P(VerilogFlowLegalize, LegalizesNamesBeforeWritingAsTheSwitchesSay) {
-    const LegalizeCase& c = GetParam();
-    ScopedEnv set(c.env ? c.env : "NLW_NO_NAMECACHE", c.env ? "" : nullptr);
-    params.SetWriteEscapedNames(c.escaped);
+    const nlwtest::Row c = nlwtest::Table("flow_legalize")[GetParam()];
+    ScopedEnv set(c[0] != "-" ? c[0].c_str() : "NLW_NO_NAMECACHE", c[0] != "-" ? "" : nullptr);
+    params.SetWriteEscapedNames(c[1] == "1");
     nlw.WriteDesign();
-    const bool cache = !c.env || std::string(c.env) != "NLW_NO_NAMECACHE";
+    const bool cache = c[0] != "NLW_NO_NAMECACHE";
     EXPECT_EQ(Nlw_Nl_SpkCache::IsBuilt(), cache);
     if (cache) {
         EXPECT_TRUE(Nlw_Nl_SpkCache::IsKeyword("specparam"));
     }
-    EXPECT_STREQ(spaced->GetWritableName(), c.spacedName);
-    if (c.aka) {
-        ASSERT_NE(spaced->GetAka(), nullptr);
-        EXPECT_STREQ(spaced->GetAka(), c.aka);
-    } else {
-        EXPECT_EQ(spaced->GetAka(), nullptr);
-    }
-    EXPECT_STREQ(dashed->GetWritableName(), c.dashedName);
+    EXPECT_STREQ(spaced->GetWritableName(), c[2].c_str());
+    EXPECT_STREQ(spaced->GetAka(), nlwtest::Opt(c[3]));
+    EXPECT_STREQ(dashed->GetWritableName(), c[4].c_str());
     EXPECT_EQ(Files(), std::vector<std::string>{"top.v"});
 }
 
-// Names escaped when written are left alone.
-INSTANTIATE_TEST_SUITE_P(
-    Switches, VerilogFlowLegalize,
-    ::testing::Values(LegalizeCase{nullptr, true, "a_b", "a b", "c-d"},
-                      LegalizeCase{nullptr, false, "a_b", "a b", "c_d"},
-                      LegalizeCase{"NLW_NO_NAMECACHE", true, "a b", nullptr, "c-d"},
-                      LegalizeCase{"VOR_NLW_LU_NO_BRIDGEID", true, "a_b", nullptr, "c-d"}));
+INSTANTIATE_TEST_SUITE_P(Switches, VerilogFlowLegalize, ::testing::Range(0, 4));
 
 TEST_F(VerilogFlow, DumpsTheHostNetlistWhenAsked) {
     {
