@@ -139,12 +139,14 @@ void Nlw_VerilogWriter::WriteView(Nlw_NlView* view, unsigned char /*flag*/) {
     // Reverse macro order, each type name once: the definition lands where
     // the last macro of that type stands in the host's list.
     UT_NCH_CACHE typeCache;
+    std::vector<Nlw_NlBlock*> blocks;
     for (size_t i = numMacros; i-- > 0;) {
         Nlw_NlBlock* block = macros[i];
         if (!block || !block->IsMacro()) continue;
         UT_NCH_NAME* entry = typeCache.add(block->GetTypeName(), 1);
-        if (entry && entry->GetCount() == 1) WriteBlock(block);
+        if (entry && entry->GetCount() == 1) blocks.push_back(block);
     }
+    WriteBlocks(view, blocks);
 
     if (params->GetSimMode() && params->GetInsert_chipwide()) WriteChipwideModule();
     if (params->GetWriteUseLib()) WriteL("`uselib");

@@ -98,6 +98,9 @@ private:
     // 2 for "x" and 3 for "z".
     static void AppendBitLiteral(std::string& out, int value);
     void WriteComponentInstantiationStatements(Nlw_NlBlock* block);
+    // Writes the module definitions of blocks in order, on two threads when
+    // they are many (Nlw_VerilogWriter_Blocks.cpp).
+    void WriteBlocks(Nlw_NlView* view, const std::vector<Nlw_NlBlock*>& blocks);
     // written: connection lines already begun before the port map (bit-init
     // lines), which the separator rule continues.
     void WritePortMaps(Nlw_NlBlock* instance, int written = 0);

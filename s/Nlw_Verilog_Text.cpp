@@ -39,7 +39,8 @@ const char* kReservedWords[] = {
 // The buffers grow for long names; the reserve keeps the usual names from
 // moving them, so a result pointer of the previous call reads the new text.
 std::string& ResultBuffer(int which) {
-    static std::string buffers[3] = {std::string(), std::string(), std::string()};
+    // One set per thread: module definitions may be written on two.
+    thread_local std::string buffers[3] = {std::string(), std::string(), std::string()};
     std::string& buffer = buffers[which];
     if (buffer.capacity() < 2048) buffer.reserve(2048);
     return buffer;
@@ -134,8 +135,8 @@ const char* Nlw_Verilog::Escape(const char* name, unsigned char isBused) {
     }
     // The base part of a bus-bit name goes to a working buffer of its own;
     // like the result, it is reused by every call.
-    static std::string base;
-    static DARRAY_Util_INT32 indexes;
+    thread_local std::string base;
+    thread_local DARRAY_Util_INT32 indexes;
     const bool isBusBit = Nlw_NlBus::IsBusName(name, base, &indexes);
     const char* candidate = isBusBit ? base.c_str() : name;
     if (this->IsEscaped(candidate)) {

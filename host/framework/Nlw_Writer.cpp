@@ -6,6 +6,7 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <cerrno>
 #include <cstdlib>
 #include <cstring>
@@ -238,6 +239,25 @@ void Nlw_Writer::Write(const char* text, int, int) {
 
 void Nlw_Writer::WriteText(const char* text, size_t len) {
     Append(text, len);
+}
+
+void Nlw_Writer::CollectText() {
+    Close();
+    access_ = Port::Stream::Memory;
+    tempName_.clear();
+    targetName_.clear();
+    fp_ = nullptr;
+    buffer_.clear();
+    ok_ = true;
+    closed_ = false;
+}
+
+void Nlw_Writer::AppendTextOf(const Nlw_Writer& other) {
+    // In pieces, so that the text is handed to the file as it goes rather
+    // than copied whole into this writer's buffer first.
+    const char* text = other.buffer_.data();
+    for (size_t at = 0, n = other.buffer_.size(); at < n; at += kFlushSize)
+        Append(text + at, std::min(kFlushSize, n - at));
 }
 
 void Nlw_Writer::WriteIText(const std::string& text) {

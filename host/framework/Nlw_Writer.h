@@ -97,6 +97,10 @@ public:
     bool Close();
     // Memory mode: the text written so far.
     std::string GetMemoryText() const { return buffer_.str(); }
+    // Makes this writer (a copy, say) collect what it is given in memory,
+    // from empty; AppendTextOf then writes that text on through another.
+    void CollectText();
+    void AppendTextOf(const Nlw_Writer& other);
 
     // Indentation unit.
     static constexpr int kIndentWidth = 2;

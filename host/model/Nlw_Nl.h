@@ -420,6 +420,10 @@ public:
     const std::vector<Nlw_NlType*>& GetTypes() const { return types_; }
     Nlw_NlType* FindType(const char* name) const;
     size_t GetNumLeafBlocks() const { return numLeaves_; }
+    // Builds now every name index that lookups build on first use (types'
+    // and macros' pins and buses, the type names), so that a view nobody
+    // changes any more can be read from several threads at once.
+    void BuildNameIndexes() const;
     // Copies a text into the view's storage; the copy lives as long as the
     // view. Null gives "".
     const char* Intern(const char* text);

@@ -192,3 +192,15 @@ int Nlw_NlType::FindPinDef(const char* name) const {
     auto it = index.pins.find(key);
     return it == index.pins.end() ? -1 : static_cast<int>(it->second);
 }
+
+void Nlw_NlView::BuildNameIndexes() const {
+    FindType("");
+    for (const Nlw_NlType* type : types_) type->FindPinDef("");
+    for (const Nlw_NlBlock* macro : macros_) {
+        macro->GetPinByAlias("");
+        macro->FindPinBus("", 0);
+        // A library type's bus index is built through any of its instances.
+        for (const Nlw_NlBlock* child : macro->GetChildren())
+            if (!child->IsMacro() && child->GetPinBuses()) child->FindPinBus("", 0);
+    }
+}

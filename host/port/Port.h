@@ -286,6 +286,28 @@ public:
     std::vector<Port_Msg> msgs;
 };
 
+// Keeps the messages one thread issues, in order, instead of issuing them:
+// work done on a second thread reports through one, and Replay issues its
+// messages where the same work done in order would have put them.
+class Port_MsgDeferral {
+public:
+    Port_MsgDeferral() = default;
+    ~Port_MsgDeferral();
+    Port_MsgDeferral(const Port_MsgDeferral&) = delete;
+    Port_MsgDeferral& operator=(const Port_MsgDeferral&) = delete;
+    // Keep the calling thread's messages from now on, until Stop.
+    void Keep();
+    void Stop();
+    // Issues the kept messages (once the keeping thread has stopped).
+    void Replay();
+
+private:
+    friend class Port_MsgManager;
+    std::vector<Port_Msg> kept_;
+    Port_MsgDeferral* outer_ = nullptr;
+    bool keeping_ = false;
+};
+
 // A message source: created for a domain, then issues printf-style messages.
 class Port_MsgManData {
 public:

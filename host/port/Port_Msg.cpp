@@ -46,8 +46,42 @@ Port_MsgManager& Port_MsgManager::Instance() {
     return manager;
 }
 
+namespace {
+// The deferral keeping this thread's messages, if any.
+thread_local Port_MsgDeferral* tlDeferral = nullptr;
+}  // namespace
+
+void Port_MsgDeferral::Keep() {
+    if (keeping_) return;
+    outer_ = tlDeferral;
+    tlDeferral = this;
+    keeping_ = true;
+}
+
+void Port_MsgDeferral::Stop() {
+    if (!keeping_) return;
+    tlDeferral = outer_;
+    keeping_ = false;
+}
+
+Port_MsgDeferral::~Port_MsgDeferral() {
+    Stop();
+}
+
+void Port_MsgDeferral::Replay() {
+    Stop();
+    std::vector<Port_Msg> kept;
+    kept.swap(kept_);
+    for (const Port_Msg& msg : kept)
+        Port_MsgManager::Instance().Issue(msg.level, msg.domain.c_str(), msg.text);
+}
+
 void Port_MsgManager::Issue(Port_MsgLevel level, const char* domain, const std::string& text) {
     const char* dom = domain ? domain : "";
+    if (tlDeferral) {
+        tlDeferral->kept_.push_back(Port_Msg{level, dom, text});
+        return;
+    }
     ++counts_[static_cast<int>(level)];
     if (console_) ShowOnConsole(level, dom, text);
     if (log_) WriteToLog(level, dom, text);

@@ -347,6 +347,30 @@ TEST_F(VerilogWriterParams, InlineListStandsBetweenTypeAndInstanceName) {
     nlwtest::ExpectGolden("params/inline", Module(top_));
 }
 
+// Module definitions written on two threads give the text and the messages
+// of one thread, in module order.
+TEST_F(VerilogWriterParams, TwoThreadsWriteWhatOneWrites) {
+    for (const char* name : {"m1", "m2", "m3", "m4", "m5"}) {
+        Nlw_NlBlock* m = b_.CreateMacro(top_, b_.AddModuleType(name), name);
+        Nlw_NlBlock* u = b_.CreateLeaf(m, lut_, "u");
+        Vdm_Property* list = Vdm_Property::NewList("EXTERNAL");
+        list->Add(Vdm_Property::NewBool(name, true));
+        list->Add(Vdm_Property::NewString("INIT", "16'h8000"));
+        u->SetExternalProperties(list);
+    }
+    auto run = [&](const char* threads) {
+        ScopedEnv env("NLW_WRITE_THREADS", threads);
+        Port_MsgCapture capture;
+        const std::string text = View();
+        return std::make_pair(text, capture.Texts(Port_MsgLevel::Internal));
+    };
+    const auto one = run("1"), two = run("2");
+    EXPECT_EQ(two.first, one.first);
+    ASSERT_EQ(one.second.size(), 5u);
+    EXPECT_EQ(two.second, one.second);
+    EXPECT_NE(one.second[0].find("'m5'"), std::string::npos) << one.second[0];
+}
+
 TEST_F(VerilogWriterParams, DefparamModeWritesStatementsBeforeEveryParametrisedLeaf) {
     ScopedEnv defparm("NLW_VERILOG_DEFPARM", "");
     Lut("u1",
