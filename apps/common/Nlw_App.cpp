@@ -1,5 +1,7 @@
 #include "Nlw_App.h"
 
+#include <malloc.h>
+
 #include <chrono>
 #include <cstdio>
 #include <cstdlib>
@@ -264,6 +266,12 @@ int RunProgram(Nlw_Program program, int argc, const char* const* argv) {
 }  // namespace
 
 int Nlw_RunProgram(Nlw_Program program, int argc, const char* const* argv) {
+#if defined(__GLIBC__) && defined(M_ARENA_MAX)
+    // One heap for every thread of the run: the threads that parse, prepare
+    // and write beside the main one would each take fresh memory for a heap
+    // of their own while the memory the main one freed stays unused.
+    mallopt(M_ARENA_MAX, 1);
+#endif
     // Memory runs out on a design too large for the machine: said as such,
     // and no file of the run is left behind (the open run removes its
     // temporaries as it unwinds).
