@@ -209,6 +209,14 @@ TEST_F(JsonReaderLayout, EveryLayoutLoadsTheSameModel) {
         << bad.errors[0];
 }
 
+// Quotes escaped in the strings between the modules and in a module's name
+// do not end the string for the scan that finds the modules.
+TEST_F(JsonReaderLayout, EscapedQuotesAtTheTopLevel) {
+    Loaded l = LoadText(nlwtest::Data("json/escaped_quotes.json"));
+    ASSERT_TRUE(l.ok) << l.errors[0];
+    nlwtest::ExpectGolden("reader/escaped_quotes", Text(l));
+}
+
 // A large file is read in two halves at once: the modules after the middle
 // must arrive whole. Blanks before them put them in the second half.
 TEST_F(JsonReaderLayout, LargeFileReadInHalvesLoadsWhole) {
