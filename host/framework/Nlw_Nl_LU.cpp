@@ -13,6 +13,7 @@
 #include <emmintrin.h>
 #endif
 
+#include "framework/Nlw_NameTable.h"
 #include "model/Nlw_NlBuilder.h"
 
 namespace {
@@ -118,71 +119,6 @@ void RenameType(Nlw_NlType* type, const std::string& name, bool bridge) {
     type->SetName(name.c_str());
 }
 
-// The taken names of a scope with the object each may be shared with.
-// Open addressing over a flat array keeps a lookup to about one probe, and
-// the stored hash spares reading the names of other entries.
-class NameTable {
-public:
-    struct Slot {
-        uint64_t hash = 0;
-        const char* data = nullptr;  // null: empty
-        size_t len = 0;
-        const void* sharer = nullptr;
-    };
-
-    void Reserve(size_t n) {
-        if (2 * n > slots_.size()) Rehash(CapacityFor(n));
-    }
-    // The sharer of key's entry, inserted with sharer when absent; second
-    // tells whether it was inserted.
-    std::pair<const void*, bool> Insert(std::string_view key, const void* sharer) {
-        if (2 * (count_ + 1) > slots_.size()) Rehash(CapacityFor(count_ + 1));
-        const uint64_t h = std::hash<std::string_view>{}(key);
-        Slot& slot = slots_[Probe(key, h)];
-        if (slot.data) return {slot.sharer, false};
-        slot = {h, key.data(), key.size(), sharer};
-        ++count_;
-        return {sharer, true};
-    }
-    // The entry of key, or null when it is absent.
-    const Slot* Find(std::string_view key) const {
-        if (slots_.empty()) return nullptr;
-        const Slot& slot = slots_[Probe(key, std::hash<std::string_view>{}(key))];
-        return slot.data ? &slot : nullptr;
-    }
-
-private:
-    static size_t CapacityFor(size_t n) {
-        size_t capacity = 16;
-        while (capacity < 2 * n) capacity *= 2;
-        return capacity;
-    }
-    size_t Probe(std::string_view key, uint64_t h) const {
-        const size_t mask = slots_.size() - 1;
-        for (size_t i = h & mask;; i = (i + 1) & mask) {
-            const Slot& slot = slots_[i];
-            if (slot.data == nullptr) return i;
-            if (slot.hash == h && slot.len == key.size() &&
-                std::memcmp(slot.data, key.data(), key.size()) == 0)
-                return i;
-        }
-    }
-    void Rehash(size_t capacity) {
-        std::vector<Slot> old(capacity);
-        old.swap(slots_);
-        const size_t mask = capacity - 1;
-        for (const Slot& slot : old) {
-            if (slot.data == nullptr) continue;
-            size_t i = slot.hash & mask;
-            while (slots_[i].data) i = (i + 1) & mask;
-            slots_[i] = slot;
-        }
-    }
-
-    std::vector<Slot> slots_;
-    size_t count_ = 0;
-};
-
 // One Verilog namespace. Each taken name may name one object that is
 // allowed to share it (a port's own inside signal).
 class Scope {
@@ -229,12 +165,12 @@ private:
     }
     bool IsFree(std::string_view key, bool plain, const void* who) const {
         if (IsKeyword(key, plain)) return false;
-        const NameTable::Slot* slot = taken_.Find(key);
+        const Nlw_NameTable::Slot* slot = taken_.Find(key);
         return slot == nullptr || (who != nullptr && slot->sharer == who);
     }
 
     bool keywords_;
-    NameTable taken_;
+    Nlw_NameTable taken_;
     std::unordered_map<std::string, uint32_t> next_;
 };
 

@@ -141,7 +141,7 @@ void ResolveType(Design& d, std::string_view name, TypeCache& cache, Cell& c) {
 void ReadCells(Design& d, Module& m, object cells) {
     Where where{m.name, {}, {}, {}};
     TypeCache cache;
-    NameSet& cellNames = d.scratch.cellNames;
+    Nlw_NameTable& cellNames = d.scratch.cellNames;
     // Room for a typical cell's connections and parameters; what is left
     // over is given back when the module is digested.
     const size_t n = cells.size();
@@ -183,7 +183,7 @@ void ReadCells(Design& d, Module& m, object cells) {
         if (!haveType) Fail(where.Text() + ": missing or bad \"type\"");
         Cell c;
         c.name = d.pool.Keep(PublicName(kv.key));
-        if (!cellNames.Insert(c.name)) Fail(where.Text() + ": given twice");
+        if (!cellNames.Insert(c.name, nullptr).second) Fail(where.Text() + ": given twice");
         ResolveType(d, PublicName(typeName), cache, c);
         // A leaf's type is its library type until its layout is known.
         const uint32_t base = c.type;

@@ -20,6 +20,7 @@
 #include <unordered_map>
 #include <vector>
 
+#include "framework/Nlw_NameTable.h"
 #include "model/Nlw_NlBuilder.h"
 #include "reader/Nlw_CellLibrary.h"
 #include "reader/Nlw_JsonReader.h"
@@ -264,57 +265,9 @@ struct NameCandidate {
     uint32_t rank;
     uint8_t flags;
 };
-// A set of names whose table is kept from one use to the next: each
-// module's cell names are checked for repeats, a million of them in a large
-// design, and a node per name would cost an allocation each.
-class NameSet {
-public:
-    // Empties the set and makes room for n names.
-    void Reset(size_t n) {
-        size_t capacity = 16;
-        while (capacity < 2 * n) capacity *= 2;
-        slots_.assign(capacity, Slot{});
-        count_ = 0;
-    }
-    // Adds name (its text must outlive the use); false when it is there.
-    bool Insert(std::string_view name) {
-        if (name.data() == nullptr) name = std::string_view("", 0);
-        const size_t h = std::hash<std::string_view>{}(name);
-        const size_t mask = slots_.size() - 1;
-        for (size_t i = h & mask;; i = (i + 1) & mask) {
-            Slot& s = slots_[i];
-            if (s.data == nullptr) {
-                s = Slot{h, name.data(), name.size()};
-                if (2 * ++count_ > slots_.size()) Grow();
-                return true;
-            }
-            if (s.hash == h && std::string_view(s.data, s.size) == name) return false;
-        }
-    }
-
-private:
-    struct Slot {
-        size_t hash = 0;
-        const char* data = nullptr;
-        size_t size = 0;
-    };
-    void Grow() {
-        std::vector<Slot> old(2 * slots_.size());
-        old.swap(slots_);
-        const size_t mask = slots_.size() - 1;
-        for (const Slot& s : old) {
-            if (s.data == nullptr) continue;
-            size_t i = s.hash & mask;
-            while (slots_[i].data) i = (i + 1) & mask;
-            slots_[i] = s;
-        }
-    }
-    std::vector<Slot> slots_;
-    size_t count_ = 0;
-};
-
 struct NameScratch {
-    NameSet cellNames;
+    // Each module's cell names, checked for repeats; the table is kept.
+    Nlw_NameTable cellNames;
     std::vector<NetEntry> entries;
     std::vector<NameCandidate> cands;
     std::vector<Text> portAka;
