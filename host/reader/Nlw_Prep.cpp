@@ -3,12 +3,8 @@
 #include "reader/Nlw_Prep.h"
 
 #include <algorithm>
-#include <exception>
 #include <string>
-#include <system_error>
-#include <thread>
 #include <unordered_map>
-#include <vector>
 
 #include "framework/Nlw_NetlistWriter.h"
 #include "framework/Nlw_Util.h"
@@ -19,9 +15,6 @@
 namespace {
 
 using Definitions = std::vector<Nlw_Property>;
-
-// From this many cells on, two threads prepare them.
-constexpr size_t kTwoThreadsFrom = 50000;
 
 // A simple identifier, or one that escaping keeps whole (no blank, control
 // character or backtick), of a length a reader takes.
@@ -127,56 +120,10 @@ void Nlw_Prep::PrepareProperties(Nlw_NetlistWriter& nlw) {
         auto it = nlw.simPropTable.find(Port::String(type->GetName()));
         defsOf.emplace(type, it == nlw.simPropTable.end() ? nullptr : it->second);
     }
-    std::vector<Nlw_NlBlock*> leaves;
-    leaves.reserve(view->GetNumLeafBlocks());
     for (Nlw_NlBlock* macro : view->GetMacros())
-        for (Nlw_NlBlock* child : macro->GetChildren())
-            if (!child->IsMacro()) leaves.push_back(child);
-    auto prepare = [&](size_t first, size_t last) {
-        for (size_t i = first; i < last; ++i) {
-            auto it = defsOf.find(leaves[i]->GetType());
-            PrepareBlock(nlw, leaves[i], it == defsOf.end() ? nullptr : it->second);
+        for (Nlw_NlBlock* child : macro->GetChildren()) {
+            if (child->IsMacro()) continue;
+            auto it = defsOf.find(child->GetType());
+            PrepareBlock(nlw, child, it == defsOf.end() ? nullptr : it->second);
         }
-    };
-    // Each cell is prepared on its own, reading the model and the table and
-    // setting its own list: a large design's second half is prepared on a
-    // second thread, whose messages are issued after the first half's, as
-    // one thread would have issued them.
-    // NLW_WRITE_THREADS=1 keeps to one thread, 2 takes two whatever the size.
-    const char* env = Port_Env::GetEnv("NLW_WRITE_THREADS");
-    const std::string asked = env ? env : "";
-    const bool two = asked == "2" ? leaves.size() > 1
-                                  : asked != "1" && leaves.size() >= kTwoThreadsFrom &&
-                                        std::thread::hardware_concurrency() > 1;
-    const size_t half = leaves.size() / 2;
-    std::thread second;
-    Port_MsgDeferral secondMessages;
-    std::exception_ptr secondFailure;
-    if (two) {
-        try {
-            second = std::thread([&] {
-                secondMessages.Keep();
-                try {
-                    prepare(half, leaves.size());
-                } catch (...) {
-                    secondFailure = std::current_exception();
-                }
-                secondMessages.Stop();
-            });
-        } catch (const std::system_error&) {
-        }
-    }
-    if (!second.joinable()) {
-        prepare(0, leaves.size());
-        return;
-    }
-    try {
-        prepare(0, half);
-    } catch (...) {
-        second.join();
-        throw;
-    }
-    second.join();
-    if (secondFailure) std::rethrow_exception(secondFailure);
-    secondMessages.Replay();
 }

@@ -181,34 +181,6 @@ TEST(PrepProperties, OffersKnownCellsAndKeepsOthersAsLiterals) {
     EXPECT_EQ(ListOf(Child(l.root(), "ff")).size(), 3u);
 }
 
-// Prepared on two threads, the cells get the lists and the messages one
-// thread gives them, in cell order.
-TEST(PrepProperties, TwoThreadsPrepareWhatOnePrepares) {
-    std::string cells;
-    for (int i = 0; i < 6; ++i)
-        cells += std::string(i ? "," : "") + "\"c" + std::to_string(i) +
-                 "\": {\"type\": \"X\", \"parameters\": {\"bad name\": \"1 \", \"N\": " +
-                 std::to_string(i) + "}, \"connections\": {}}";
-    const std::string json = "{\"modules\": {\"top\": {\"cells\": {" + cells + "}}}}";
-    auto run = [&](const char* threads) {
-        nlwtest::ScopedEnv env("NLW_WRITE_THREADS", threads);
-        Loaded l = LoadText(json);
-        RecordingWriter nlw;
-        nlw.SetView(l.view.get());
-        Port_MsgCapture capture;
-        Nlw_Prep::PrepareProperties(nlw);
-        std::vector<std::string> lists;
-        for (const Nlw_NlBlock* c : l.root()->GetChildren())
-            for (const std::string& e : ListOf(c)) lists.push_back(e);
-        return std::make_pair(lists, capture.Texts(Port_MsgLevel::Error));
-    };
-    const auto one = run("1"), two = run("2");
-    EXPECT_EQ(two.first, one.first);
-    ASSERT_EQ(one.second.size(), 6u);
-    EXPECT_EQ(two.second, one.second);
-    EXPECT_NE(one.second[5].find("'c5'"), std::string::npos) << one.second[5];
-}
-
 TEST(PrepInstallation, LoadsTheTableAndItsVectorDefinitions) {
     {
         Installation inst(DataFiles{{"simprops.dat",
