@@ -71,10 +71,9 @@ Port::String MakeVectorText(Nlw_NetlistWriter& nlw, const Nlw_Property& definiti
                                    parameterName.c_str());
         nlw.PadOrTrim(digits, value, "0");
     }
-    std::string& literal = widthText;
-    literal += hex ? "'h" : "'b";
-    literal += value.str();
-    return Port::String(literal);
+    widthText += hex ? "'h" : "'b";
+    widthText += value.str();
+    return Port::String(widthText);
 }
 
 // A value the literal of its kind can hold: hexadecimal ('h') or binary

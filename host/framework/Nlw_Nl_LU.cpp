@@ -2,7 +2,6 @@
 // limits and unique names per Verilog scope.
 #include "framework/Nlw_Nl_LU.h"
 
-#include <charconv>
 #include <cstdio>
 #include <cstring>
 #include <string_view>
@@ -193,16 +192,6 @@ const Nlw_NlBus* InsideBus(const Nlw_NlPinBus* bus) {
 // Members carry their bus's name and their index. Most already do, so the
 // name is built in one reused buffer and the member renamed only when it
 // differs.
-void MemberName(std::string& out, const char* base, int64_t index) {
-    const int style = Nlw_NlBus::GetOutputDelimiterType();
-    char digits[24];
-    const std::to_chars_result end = std::to_chars(digits, digits + sizeof digits, index);
-    out.assign(base);
-    out += Nlw_NlBus::GetLeftDelimiter(style);
-    out.append(digits, end.ptr);
-    out += Nlw_NlBus::GetRightDelimiter(style);
-}
-
 template <class Bus, class GetMember>
 void FollowBus(const Bus* bus, bool bridge, GetMember member) {
     const int64_t low = bus->GetMSB(0) < bus->GetLSB(0) ? bus->GetMSB(0) : bus->GetLSB(0);
@@ -210,7 +199,7 @@ void FollowBus(const Bus* bus, bool bridge, GetMember member) {
     std::string name;
     for (int64_t i = low; i <= high; ++i) {
         if (auto* object = member(bus, static_cast<int32_t>(i))) {
-            MemberName(name, bus->GetWritableName(), i);
+            Nlw_NlMemberName(name, bus->GetWritableName(), i);
             Rename(object, name, bridge);
         }
     }
@@ -403,8 +392,9 @@ void Nlw_Nl_LU::ProcessCellPins() {
             }
             // Members lie at fixed positions of the definitions.
             const int64_t low = bus->msb_ < bus->lsb_ ? bus->msb_ : bus->lsb_;
+            std::string member;
             for (int64_t i = 0; i < bus->GetWidth(); ++i) {
-                const std::string member = Nlw_NlMemberName(bus->GetWritableName(), low + i);
+                Nlw_NlMemberName(member, bus->GetWritableName(), low + i);
                 Nlw_NlType::PinDef& def = defs[bus->firstPinPos_ + bus->posStep_ * i];
                 if (member != def.name) setDef(def, member);
             }

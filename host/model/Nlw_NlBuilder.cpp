@@ -75,7 +75,8 @@ Nlw_NlPinBus* Nlw_NlBuilder::AddTypePinBus(Nlw_NlType* type, const char* name, i
     Nlw_NlPinBus* bus = NewPinBus(name, dir, msb, lsb, type->pinDefs_.size());
     bus->type_ = type;
     for (int64_t i = msb;; i += bus->posStep_ > 0 ? 1 : -1) {
-        type->pinDefs_.push_back({view_->Intern(Nlw_NlMemberName(bus->name_, i).c_str()),
+        Nlw_NlMemberName(memberName_, bus->name_, i);
+        type->pinDefs_.push_back({view_->Intern(memberName_.data(), memberName_.size()),
                                   static_cast<uint8_t>(dir), 0, bus});
         if (i == lsb) break;
     }
@@ -221,8 +222,9 @@ Nlw_NlPinBus* Nlw_NlBuilder::AddPortBus(Nlw_NlBlock* macro, const char* name, in
     Nlw_NlPinBus* bus = NewPinBus(name, dir, msb, lsb, macro->numPins_);
     bus->owner_ = macro;
     for (int64_t i = msb;; i += bus->posStep_ > 0 ? 1 : -1) {
+        Nlw_NlMemberName(memberName_, bus->name_, i);
         Nlw_NlPin* pin =
-            AppendPort(macro, view_->Intern(Nlw_NlMemberName(bus->name_, i).c_str()), dir);
+            AppendPort(macro, view_->Intern(memberName_.data(), memberName_.size()), dir);
         pin->bus_ = bus;
         if (i == lsb) break;
     }
@@ -298,8 +300,8 @@ Nlw_NlSignal* Nlw_NlBuilder::GetSignalBusMember(Nlw_NlBus* bus, int32_t index) {
     if (index < low || index > high) return nullptr;
     void*& slot = bus->members_[int64_t(index) - low];
     if (slot == nullptr) {
-        const std::string name = Nlw_NlMemberName(bus->name_, index);
-        Nlw_NlSignal* signal = NewSignal(bus->owner_, name.data(), name.size());
+        Nlw_NlMemberName(memberName_, bus->name_, index);
+        Nlw_NlSignal* signal = NewSignal(bus->owner_, memberName_.data(), memberName_.size());
         signal->bus_ = bus;
         slot = signal;
     }

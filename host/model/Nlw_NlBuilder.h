@@ -81,6 +81,7 @@ private:
     static void Append(Nlw_NlSignal* s, Nlw_NlPin* p);
     static void Unlink(Nlw_NlSignal* s, Nlw_NlPin* p);
     Nlw_NlView* view_;
+    std::string memberName_;  // reused for every bus member named
 };
 
 // Storage and indexes behind the model. Only the model's own sources use
@@ -136,6 +137,9 @@ bool Nlw_NlSplitIndex(const char* name, size_t end, int style, size_t& left, int
 
 // A bus member's name: "base[index]" in the output delimiter style.
 std::string Nlw_NlMemberName(const char* base, int64_t index);
+// The same into out, whose storage is reused: members are named one after
+// another, a bus at a time.
+void Nlw_NlMemberName(std::string& out, const char* base, int64_t index);
 
 // What only a macro block carries.
 struct Nlw_NlBlock::MacroData {

@@ -1,5 +1,6 @@
 // Buses: the process-wide delimiter settings, bus-bit name splitting, index
 // tuple walks and member lookup.
+#include <charconv>
 #include <cstring>
 
 #include "model/Nlw_NlBuilder.h"
@@ -49,12 +50,19 @@ bool Nlw_NlSplitIndex(const char* name, size_t end, int style, size_t& left, int
 }
 
 std::string Nlw_NlMemberName(const char* base, int64_t index) {
-    const int style = gOutputDelimiterType;
-    std::string text(base);
-    text += Nlw_NlBus::GetLeftDelimiter(style);
-    text += std::to_string(index);
-    text += Nlw_NlBus::GetRightDelimiter(style);
+    std::string text;
+    Nlw_NlMemberName(text, base, index);
     return text;
+}
+
+void Nlw_NlMemberName(std::string& out, const char* base, int64_t index) {
+    const int style = gOutputDelimiterType;
+    char digits[24];
+    const std::to_chars_result end = std::to_chars(digits, digits + sizeof digits, index);
+    out.assign(base);
+    out += Nlw_NlBus::GetLeftDelimiter(style);
+    out.append(digits, end.ptr);
+    out += Nlw_NlBus::GetRightDelimiter(style);
 }
 
 void Nlw_NlBus::SetMultiDimensions(bool on) {

@@ -185,8 +185,7 @@ private:
             reason = std::strerror(error);
             return false;
         }
-        const size_t done = error == 0 ? size : 0;
-        if (done != size || ::fstat(fd, &after) != 0 || after.st_size != before.st_size ||
+        if (error == kShort || ::fstat(fd, &after) != 0 || after.st_size != before.st_size ||
             after.st_mtim.tv_sec != before.st_mtim.tv_sec ||
             after.st_mtim.tv_nsec != before.st_mtim.tv_nsec) {
             reason = "the file changed while it was read";
