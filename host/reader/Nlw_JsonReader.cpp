@@ -71,6 +71,7 @@ void Design::ReleaseDocument() {
     std::unordered_map<std::string_view, uint32_t>().swap(typeIndex);
     parser = simdjson::dom::parser();
     scratch = NameScratch();
+    threadScratch = NameScratch();
 }
 
 namespace {

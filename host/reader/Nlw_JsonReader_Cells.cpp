@@ -91,8 +91,11 @@ object ObjectOf(element e, const Where& where, const char* key) {
     return o;
 }
 
-void ReadCellAttrs(object attrs, TextPool& pool, CellExtra& x, const Where& where, bool pad) {
-    std::string_view loc;
+// The attributes the writers read; "LOC" is kept aside, since it stands for
+// the package pin only on a pad, and whether the cell is one is known only
+// when its type is resolved.
+void ReadCellAttrs(object attrs, TextPool& pool, CellExtra& x, std::string_view& loc,
+                   const Where& where) {
     for (auto kv : attrs) {
         std::string_view k = kv.key;
         if (k == "hdlname") {
@@ -105,8 +108,6 @@ void ReadCellAttrs(object attrs, TextPool& pool, CellExtra& x, const Where& wher
             x.typeAttr = pool.Keep(ValueText(ReadValue(kv.value, pool, where), pool));
         }
     }
-    // "LOC" stands for the package pin only on a pad.
-    if (!*x.pinName && pad && !loc.empty()) x.pinName = pool.Keep(loc);
 }
 
 // The cell's type: a module of the file, or a library type. Runs of cells
@@ -138,10 +139,10 @@ void ResolveType(Design& d, std::string_view name, TypeCache& cache, Cell& c) {
 
 }  // namespace
 
-void ReadCells(Design& d, Module& m, object cells) {
+void ReadCellTexts(Module& m, object cells, TextPool& pool, NameScratch& scratch,
+                   DigestWork& work) {
     Where where{m.name, {}, {}, {}};
-    TypeCache cache;
-    Nlw_NameTable& cellNames = d.scratch.cellNames;
+    Nlw_NameTable& cellNames = scratch.cellNames;
     // Room for a typical cell's connections and parameters; what is left
     // over is given back when the module is digested.
     const size_t n = cells.size();
@@ -150,6 +151,8 @@ void ReadCells(Design& d, Module& m, object cells) {
     m.conns.reserve(m.conns.size() + 4 * n);
     m.refs.reserve(m.refs.size() + 4 * n);
     m.params.reserve(m.params.size() + n);
+    work.cells.reserve(n);
+    work.connKeys.reserve(4 * n);
     for (auto kv : cells) {
         where.cell = kv.key;
         where.section = {};
@@ -158,14 +161,15 @@ void ReadCells(Design& d, Module& m, object cells) {
         if (kv.value.get_object().get(co)) Fail(where.Text() + ": expected an object");
         // One walk over the cell's members; the connections wait for the
         // type and the directions.
-        std::string_view typeName;
-        bool haveType = false, haveDirs = false, haveConns = false;
-        object params, attrs, dirs, conns;
+        CellTexts t;
+        t.key = kv.key;
+        bool haveType = false, haveConns = false;
+        object params, attrs, conns;
         bool haveParams = false, haveAttrs = false;
         for (auto f : co) {
             std::string_view k = f.key;
             if (k == "type") {
-                haveType = !f.value.get_string().get(typeName);
+                haveType = !f.value.get_string().get(t.typeName);
             } else if (k == "parameters") {
                 params = ObjectOf(f.value, where, "parameters");
                 haveParams = true;
@@ -173,85 +177,110 @@ void ReadCells(Design& d, Module& m, object cells) {
                 attrs = ObjectOf(f.value, where, "attributes");
                 haveAttrs = true;
             } else if (k == "port_directions") {
-                dirs = ObjectOf(f.value, where, "port_directions");
-                haveDirs = true;
+                t.dirs = ObjectOf(f.value, where, "port_directions");
+                t.haveDirs = true;
             } else if (k == "connections") {
                 conns = ObjectOf(f.value, where, "connections");
                 haveConns = true;
             }
         }
         if (!haveType) Fail(where.Text() + ": missing or bad \"type\"");
-        Cell c;
-        c.name = d.pool.Keep(PublicName(kv.key));
-        if (!cellNames.Insert(c.name, nullptr).second) Fail(where.Text() + ": given twice");
-        ResolveType(d, PublicName(typeName), cache, c);
-        // A leaf's type is its library type until its layout is known.
-        const uint32_t base = c.type;
-        const bool pad = !c.macro && d.types[base].pad;
+        Cell& c = m.cells.emplace_back();
+        c.name = pool.Keep(PublicName(kv.key));
+        if (!cellNames.Insert(c.name, nullptr).second) {
+            m.cells.pop_back();
+            Fail(where.Text() + ": given twice");
+        }
+        // From here on, a fault of the cell comes after those its type and
+        // connections have: the cell is resolved up to the fault.
+        work.cells.push_back(t);
+        CellTexts& kept = work.cells.back();
 
         c.paramFirst = static_cast<uint32_t>(m.params.size());
+        c.connFirst = static_cast<uint32_t>(m.conns.size());
         if (haveParams) {
             where.section = "parameter";
             for (auto pv : params) {
                 where.key = pv.key;
-                Value v = ReadValue(pv.value, d.pool, where);
+                Value v = ReadValue(pv.value, pool, where);
                 Param p;
-                p.name = d.pool.Keep(pv.key);
+                p.name = pool.Keep(pv.key);
                 p.kind = v.kind;
                 p.text = v.kind == ValueKind::Bits || v.kind == ValueKind::String
-                             ? d.pool.Keep(v.text)
+                             ? pool.Keep(v.text)
                              : "";
                 p.i = v.i;
                 p.d = v.d;
                 m.params.push_back(p);
+                ++c.paramCount;
             }
             where.section = {};
             where.key = {};
         }
-        c.paramCount = static_cast<uint32_t>(m.params.size()) - c.paramFirst;
         if (haveAttrs && attrs.size() > 0) {
             CellExtra x;
-            ReadCellAttrs(attrs, d.pool, x, where, pad);
+            ReadCellAttrs(attrs, pool, x, kept.loc, where);
             if (*x.aka || *x.pinName || *x.typeAttr) {
                 c.extra = static_cast<uint32_t>(m.extras.size());
                 m.extras.push_back(x);
             }
         }
-
-        c.connFirst = static_cast<uint32_t>(m.conns.size());
         if (haveConns) {
             where.section = "connection";
-            uint32_t position = 0;
             for (auto cv : conns) {
                 where.key = cv.key;
                 Conn cn;
                 cn.bitFirst = static_cast<uint32_t>(m.refs.size());
                 cn.width = ReadBits(cv.value, m, where);
-                const std::string_view pin = PublicName(cv.key);
-                cn.slot = c.macro ? MacroSlot(d.modules[c.type], position, pin, cn.width, where)
-                                  : LeafSlot(d, d.types[base], position, pin, cn.width, dirs,
-                                             haveDirs, where);
                 m.conns.push_back(cn);
-                ++position;
+                work.connKeys.push_back(cv.key);
+                ++c.connCount;
             }
-            where.section = {};
-            where.key = {};
         }
-        c.connCount = static_cast<uint32_t>(m.conns.size()) - c.connFirst;
-        if (!c.macro) {
-            // A type the library does not define also takes the pins its
-            // instances declare without connecting them.
-            LibType& lt = d.types[base];
-            if (haveDirs && !lt.def && lt.blackbox < 0 && dirs.size() != c.connCount) {
-                for (auto dv : dirs)
-                    if (!lt.pinIndex.count(PublicName(dv.key)))
-                        AddPin(lt, PublicName(dv.key), DirectionOf(dirs, true, dv.key), d.pool);
-            }
-            c.type = FindOrAddVariant(d, base, m, c);
-            if (pad) m.ownPads = true;
-        }
-        m.cells.push_back(c);
     }
+}
+
+void ResolveCells(Design& d, Module& m, DigestWork& work) {
+    Where where{m.name, {}, "connection", {}};
+    TypeCache cache;
+    for (size_t i = 0; i < work.cells.size(); ++i) {
+        Cell& c = m.cells[i];
+        const CellTexts& t = work.cells[i];
+        where.cell = t.key;
+        ResolveType(d, PublicName(t.typeName), cache, c);
+        // A leaf's type is its library type until its layout is known.
+        const uint32_t base = c.type;
+        const bool pad = !c.macro && d.types[base].pad;
+        for (uint32_t k = 0; k < c.connCount; ++k) {
+            Conn& cn = m.conns[c.connFirst + k];
+            where.key = work.connKeys[c.connFirst + k];
+            const std::string_view pin = PublicName(where.key);
+            cn.slot = c.macro
+                          ? MacroSlot(d.modules[c.type], k, pin, cn.width, where)
+                          : LeafSlot(d, d.types[base], k, pin, cn.width, t.dirs, t.haveDirs, where);
+        }
+        if (c.macro) continue;
+        // A type the library does not define also takes the pins its
+        // instances declare without connecting them.
+        LibType& lt = d.types[base];
+        if (t.haveDirs && !lt.def && lt.blackbox < 0 && t.dirs.size() != c.connCount) {
+            for (auto dv : t.dirs)
+                if (!lt.pinIndex.count(PublicName(dv.key)))
+                    AddPin(lt, PublicName(dv.key), DirectionOf(t.dirs, true, dv.key), d.pool);
+        }
+        c.type = FindOrAddVariant(d, base, m, c);
+        if (!pad) continue;
+        m.ownPads = true;
+        if (!t.loc.empty()) {
+            if (c.extra == kNone) {
+                c.extra = static_cast<uint32_t>(m.extras.size());
+                m.extras.emplace_back();
+            }
+            CellExtra& x = m.extras[c.extra];
+            if (!*x.pinName) x.pinName = d.pool.Keep(t.loc);
+        }
+    }
+    if (work.fault) std::rethrow_exception(work.fault);
 }
 
 }  // namespace nlw_json

@@ -117,10 +117,17 @@ void ResolveHierarchy(Design& d) {
     std::vector<uint32_t> reached;
     for (uint32_t i = 0; i < d.modules.size(); ++i)
         if (d.modules[i].reachable) reached.push_back(i);
-    ParseAhead ahead(d, reached);
+    // Both threads parse and digest the texts of every other module; the
+    // cells are resolved here, in order, while the module's document is
+    // open.
+    DigestWork work[ParseAhead::kSlots];
+    ParseAhead ahead(d, reached, true, [&](size_t k, int thread) {
+        DigestModuleTexts(d.modules[reached[k]], thread ? d.threadPool : d.pool,
+                          thread ? d.threadScratch : d.scratch, work[k % ParseAhead::kSlots]);
+    });
     for (size_t k = 0; k < reached.size(); ++k) {
         ahead.Open(k);
-        DigestModule(d, d.modules[reached[k]]);
+        ResolveCells(d, d.modules[reached[k]], work[k % ParseAhead::kSlots]);
     }
     for (uint32_t mi : d.bottomUp) {
         Module& m = d.modules[mi];

@@ -11,6 +11,8 @@
 
 #include <condition_variable>
 #include <cstdint>
+#include <exception>
+#include <functional>
 #include <map>
 #include <memory>
 #include <mutex>
@@ -276,6 +278,24 @@ struct NameScratch {
     std::vector<int32_t> winner, busOf, bitMap;
 };
 
+// What the digest of a module's texts leaves for the resolution of its
+// cells (see DigestModuleTexts): per cell, the texts that name its type and
+// pins, pointing into the module's parsed document.
+struct CellTexts {
+    std::string_view key;       // the cell's name as the file gives it
+    std::string_view typeName;  // with yosys's public mark
+    simdjson::dom::object dirs;
+    bool haveDirs = false;
+    std::string_view loc;  // "LOC": the package pin, should the cell be a pad
+};
+struct DigestWork {
+    std::vector<CellTexts> cells;            // per cell of Module::cells
+    std::vector<std::string_view> connKeys;  // per connection of Module::conns
+    // The first fault of the texts, to be raised once the cells before it
+    // are resolved (their faults come first).
+    std::exception_ptr fault;
+};
+
 struct Design {
     std::string fileName;
     Nlw_ReadOptions options;
@@ -285,6 +305,8 @@ struct Design {
     bool exactSplit = false;
     simdjson::dom::parser parser;
     TextPool pool;
+    // Texts kept by the second thread of the digest (ResolveHierarchy).
+    TextPool threadPool;
     std::vector<Module> modules;
     std::unordered_map<std::string_view, uint32_t> moduleIndex;
     std::vector<LibType> types;
@@ -295,7 +317,7 @@ struct Design {
     uint32_t top = 0;
     // Modules reachable from the top, each after every module it instantiates.
     std::vector<uint32_t> bottomUp;
-    NameScratch scratch;
+    NameScratch scratch, threadScratch;
 
     const char* File() const { return fileName.c_str(); }
     // Lets the document go once every module is digested; the names and
@@ -314,14 +336,20 @@ void SplitModules(Design& d);
 // GuessFailed; else the message a parse of the whole text gives.
 [[noreturn]] void OpenFailed(Design& d);
 
-// Parses the modules of a list in a thread of its own, one module ahead of
-// the one being read (Nlw_JsonReader_ParseAhead.cpp).
+// Parses the modules of a list in a thread of its own, ahead of the one
+// being read (Nlw_JsonReader_ParseAhead.cpp).
 class ParseAhead {
 public:
+    // Done with the k-th module of the order as soon as it is parsed, by the
+    // thread that parsed it (0: the caller's, 1: the other). It must not
+    // throw. Module k's document lives until module k + kSlots is parsed.
+    using Work = std::function<void(size_t k, int thread)>;
+    static constexpr size_t kSlots = 4;
     // order: the modules to be opened, in the order they will be. With
-    // share, the caller does little with each module: it parses every other
-    // module itself while the thread parses the rest.
-    ParseAhead(Design& d, const std::vector<uint32_t>& order, bool share = false);
+    // share, the caller parses every other module itself (and does the work
+    // with it) while the thread parses the rest.
+    ParseAhead(Design& d, const std::vector<uint32_t>& order, bool share = false,
+               Work work = nullptr);
     ~ParseAhead();
     ParseAhead(const ParseAhead&) = delete;
     ParseAhead& operator=(const ParseAhead&) = delete;
@@ -336,13 +364,15 @@ private:
         simdjson::error_code error = simdjson::SUCCESS;
     };
     void Run();
-    void Parse(size_t k);
+    // Parses module k and does the work with it.
+    void Parse(size_t k, int thread);
 
     Design& d_;
     std::vector<uint32_t> order_;
     std::vector<std::pair<size_t, size_t>> ranges_;  // of the text, per module of the order
-    Slot slots_[2];
+    Slot slots_[kSlots];
     bool share_;
+    Work work_;
     size_t parsed_ = 0;    // modules of the order parsed (by the thread)
     size_t released_ = 0;  // modules of the order done with
     bool stop_ = false;
@@ -358,9 +388,17 @@ void ParseWhole(Design& d);
 // Reading the document (Nlw_JsonReader_Modules.cpp, Nlw_JsonReader_Cells.cpp).
 // The module list with every module's attributes, ports and children.
 void ReadModuleList(Design& d);
-// Named nets and cells of a module reached from the top, opened already.
-void DigestModule(Design& d, Module& m);
-void ReadCells(Design& d, Module& m, simdjson::dom::object cells);
+// A module reached from the top, opened already, is digested in two steps.
+// The first reads its named nets and cells into its tables and names its
+// nets: it touches nothing but the module, the pool and the scratch given,
+// so modules may be digested so in parallel; a fault is kept in the work.
+// The second, in file order, resolves the cells' types and connects their
+// pins (library types are numbered, and grow pins, in the order they are
+// met); the document must still be open.
+void DigestModuleTexts(Module& m, TextPool& pool, NameScratch& scratch, DigestWork& work);
+void ResolveCells(Design& d, Module& m, DigestWork& work);
+void ReadCellTexts(Module& m, simdjson::dom::object cells, TextPool& pool, NameScratch& scratch,
+                   DigestWork& work);
 // Appends the bits of a bit array to m.refs (raw bit numbers, to be mapped
 // to local nets) and returns how many there were.
 uint32_t ReadBits(simdjson::dom::element e, Module& m, const Where& where);

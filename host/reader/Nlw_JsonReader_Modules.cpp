@@ -437,54 +437,69 @@ void ReadModuleList(Design& d) {
     d.exactSplit = true;
 }
 
-void DigestModule(Design& d, Module& m) {
+namespace {
+
+void ReadNetNames(Module& m, TextPool& pool, std::vector<NetEntry>& entries) {
     Where where{m.name, {}, "net", {}};
-    std::vector<NetEntry>& entries = d.scratch.entries;
     entries.clear();
     object netnames;
-    if (OptionalObject(m.json, "netnames", where, netnames)) {
-        for (auto kv : netnames) {
-            where.key = kv.key;
-            object no = AsObject(kv.value, where, "a net");
-            NetEntry n;
-            n.name = d.pool.Keep(PublicName(kv.key));
-            n.hidden = ReadInt(no, "hide_name", 0, where) != 0;
-            element bits;
-            if (no.at_key("bits").get(bits)) Fail(where.Text() + ": missing \"bits\"");
-            n.bitFirst = static_cast<uint32_t>(m.refs.size());
-            n.width = ReadBits(bits, m, where);
-            ReadRange(no, n.width, where, n.msb, n.lsb);
-            Attrs a = ReadNetAttrs(no, d.pool, where);
-            n.aka = a.aka;
-            n.flags = a.nameFlags;
-            auto pit = m.portIndex.find(PublicName(kv.key));
-            if (pit != m.portIndex.end()) {
-                n.port = static_cast<int32_t>(pit->second);
-                if (*a.pinName) m.ports[pit->second].pinName = a.pinName;
-            }
-            if (a.global == "SETRESET" || a.global == "TRISTATE") {
-                if (n.width > 0 && m.refs[n.bitFirst] >= 0) {
-                    GlobalNet g;
-                    g.setReset = a.global == "SETRESET";
-                    g.ref = static_cast<int32_t>(n.bitFirst);  // mapped below
-                    g.conn = static_cast<int32_t>(g.setReset ? a.setResetConn : a.tristateConn);
-                    g.floatVal = static_cast<int32_t>(a.floatVal);
-                    m.globals.push_back(g);
-                }
-            }
-            entries.push_back(n);
+    if (!OptionalObject(m.json, "netnames", where, netnames)) return;
+    for (auto kv : netnames) {
+        where.key = kv.key;
+        object no = AsObject(kv.value, where, "a net");
+        NetEntry n;
+        n.name = pool.Keep(PublicName(kv.key));
+        n.hidden = ReadInt(no, "hide_name", 0, where) != 0;
+        element bits;
+        if (no.at_key("bits").get(bits)) Fail(where.Text() + ": missing \"bits\"");
+        n.bitFirst = static_cast<uint32_t>(m.refs.size());
+        n.width = ReadBits(bits, m, where);
+        ReadRange(no, n.width, where, n.msb, n.lsb);
+        Attrs a = ReadNetAttrs(no, pool, where);
+        n.aka = a.aka;
+        n.flags = a.nameFlags;
+        auto pit = m.portIndex.find(PublicName(kv.key));
+        if (pit != m.portIndex.end()) {
+            n.port = static_cast<int32_t>(pit->second);
+            if (*a.pinName) m.ports[pit->second].pinName = a.pinName;
         }
+        if (a.global == "SETRESET" || a.global == "TRISTATE") {
+            if (n.width > 0 && m.refs[n.bitFirst] >= 0) {
+                GlobalNet g;
+                g.setReset = a.global == "SETRESET";
+                g.ref = static_cast<int32_t>(n.bitFirst);  // mapped below
+                g.conn = static_cast<int32_t>(g.setReset ? a.setResetConn : a.tristateConn);
+                g.floatVal = static_cast<int32_t>(a.floatVal);
+                m.globals.push_back(g);
+            }
+        }
+        entries.push_back(n);
     }
-    object cells;
-    if (OptionalObject(m.json, "cells", Where{m.name, {}, {}, {}}, cells)) ReadCells(d, m, cells);
-    NameNets(m, d.scratch, d.pool);
-    for (GlobalNet& g : m.globals) g.ref = m.refs[static_cast<size_t>(g.ref)];
-    // Growth left room at the ends of the tables; the model is built while
-    // they live.
-    Trim(m.refs);
-    Trim(m.cells);
-    Trim(m.conns);
-    Trim(m.params);
+}
+
+}  // namespace
+
+void DigestModuleTexts(Module& m, TextPool& pool, NameScratch& scratch, DigestWork& work) {
+    work.cells.clear();
+    work.connKeys.clear();
+    work.fault = nullptr;
+    try {
+        ReadNetNames(m, pool, scratch.entries);
+        object cells;
+        if (OptionalObject(m.json, "cells", Where{m.name, {}, {}, {}}, cells))
+            ReadCellTexts(m, cells, pool, scratch, work);
+        NameNets(m, scratch, pool);
+        for (GlobalNet& g : m.globals) g.ref = m.refs[static_cast<size_t>(g.ref)];
+        // Growth left room at the ends of the tables; the model is built
+        // while they live.
+        Trim(m.refs);
+        Trim(m.cells);
+        Trim(m.conns);
+        Trim(m.params);
+    } catch (...) {
+        // A fault of the text, or no memory: raised in file order.
+        work.fault = std::current_exception();
+    }
 }
 
 }  // namespace nlw_json
