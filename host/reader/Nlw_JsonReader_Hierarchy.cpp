@@ -121,7 +121,7 @@ void ResolveHierarchy(Design& d) {
     // cells are resolved here, in order, while the module's document is
     // open.
     DigestWork work[ParseAhead::kSlots];
-    ParseAhead ahead(d, reached, true, [&](size_t k, int thread) {
+    ParseAhead ahead(d, reached, [&](size_t k, int thread) {
         DigestModuleTexts(d.modules[reached[k]], thread ? d.threadPool : d.pool,
                           thread ? d.threadScratch : d.scratch, work[k % ParseAhead::kSlots]);
     });

@@ -336,20 +336,18 @@ void SplitModules(Design& d);
 // GuessFailed; else the message a parse of the whole text gives.
 [[noreturn]] void OpenFailed(Design& d);
 
-// Parses the modules of a list in a thread of its own, ahead of the one
-// being read (Nlw_JsonReader_ParseAhead.cpp).
+// Parses the modules of a list on two threads, ahead of the one being read
+// (Nlw_JsonReader_ParseAhead.cpp).
 class ParseAhead {
 public:
     // Done with the k-th module of the order as soon as it is parsed, by the
     // thread that parsed it (0: the caller's, 1: the other). It must not
-    // throw. Module k's document lives until module k + kSlots is parsed.
+    // throw. Module k's document lives until module k + 1 is opened.
     using Work = std::function<void(size_t k, int thread)>;
-    static constexpr size_t kSlots = 4;
-    // order: the modules to be opened, in the order they will be. With
-    // share, the caller parses every other module itself (and does the work
-    // with it) while the thread parses the rest.
-    ParseAhead(Design& d, const std::vector<uint32_t>& order, bool share = false,
-               Work work = nullptr);
+    // Modules parsed and not yet let go, at most.
+    static constexpr size_t kSlots = 8;
+    // order: the modules to be opened, in the order they will be.
+    ParseAhead(Design& d, const std::vector<uint32_t>& order, Work work = nullptr);
     ~ParseAhead();
     ParseAhead(const ParseAhead&) = delete;
     ParseAhead& operator=(const ParseAhead&) = delete;
@@ -366,15 +364,18 @@ private:
     void Run();
     // Parses module k and does the work with it.
     void Parse(size_t k, int thread);
+    // Whether the next module may be taken: its slot is free.
+    bool Claimable() const;
 
     Design& d_;
     std::vector<uint32_t> order_;
     std::vector<std::pair<size_t, size_t>> ranges_;  // of the text, per module of the order
     Slot slots_[kSlots];
-    bool share_;
     Work work_;
-    size_t parsed_ = 0;    // modules of the order parsed (by the thread)
-    size_t released_ = 0;  // modules of the order done with
+    // Guarded by mutex_:
+    std::vector<uint8_t> done_;  // per module of the order: parsed
+    size_t claimed_ = 0;         // modules of the order taken by either thread
+    size_t released_ = 0;        // modules of the order done with
     bool stop_ = false;
     std::mutex mutex_;
     std::condition_variable changed_;

@@ -394,7 +394,7 @@ void ReadModuleListOnce(Design& d) {
     for (uint32_t i = 0; i < d.modules.size(); ++i)
         if (!d.moduleIndex.emplace(d.modules[i].name, i).second) {
             // A fault of the text anywhere is reported first.
-            ParseAhead check(d, all, true);
+            ParseAhead check(d, all);
             for (size_t k = 0; k < all.size(); ++k) check.Open(k);
             Fail("module '" + std::string(d.modules[i].name) + "' is defined twice");
         }
@@ -405,7 +405,7 @@ void ReadModuleListOnce(Design& d) {
     // module has been parsed, so that a fault of the text comes first.
     std::vector<uint32_t> stamp(d.modules.size(), 0);
     std::optional<ReadError> first;
-    ParseAhead ahead(d, all, true);
+    ParseAhead ahead(d, all);
     for (uint32_t i = 0; i < d.modules.size(); ++i) {
         Module& m = d.modules[i];
         ahead.Open(i);

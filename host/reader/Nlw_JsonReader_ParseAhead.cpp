@@ -12,12 +12,12 @@ namespace {
 
 // A slot's parser keeps the memory of the largest module it has parsed; one
 // very large module does not keep it for the rest of the read.
-constexpr size_t kKeepCapacity = size_t(16) << 20;
+constexpr size_t kKeepCapacity = size_t(2) << 20;
 
 }  // namespace
 
-ParseAhead::ParseAhead(Design& d, const std::vector<uint32_t>& order, bool share, Work work)
-    : d_(d), order_(order), share_(share), work_(std::move(work)) {
+ParseAhead::ParseAhead(Design& d, const std::vector<uint32_t>& order, Work work)
+    : d_(d), order_(order), work_(std::move(work)), done_(order.size(), 0) {
     // The thread reads the places only: the modules themselves change.
     ranges_.reserve(order_.size());
     for (uint32_t i : order_) ranges_.emplace_back(d.modules[i].textBegin, d.modules[i].textEnd);
@@ -49,21 +49,21 @@ void ParseAhead::Parse(size_t k, int thread) {
     if (work_) work_(k, thread);
 }
 
+bool ParseAhead::Claimable() const {
+    return claimed_ < order_.size() && claimed_ < released_ + kSlots;
+}
+
 void ParseAhead::Run() {
-    // Shared, the thread takes the even places; the caller the odd ones.
-    const size_t step = share_ ? 2 : 1;
-    for (size_t k = 0; k < order_.size(); k += step) {
-        {
-            // Module k's slot is free once module k - kSlots is let go.
-            std::unique_lock<std::mutex> lock(mutex_);
-            changed_.wait(lock, [&] { return stop_ || k < released_ + kSlots; });
-            if (stop_) return;
-        }
+    std::unique_lock<std::mutex> lock(mutex_);
+    for (;;) {
+        // Module k's slot is free once module k - kSlots is let go.
+        changed_.wait(lock, [&] { return stop_ || claimed_ >= order_.size() || Claimable(); });
+        if (stop_ || claimed_ >= order_.size()) return;
+        const size_t k = claimed_++;
+        lock.unlock();
         Parse(k, 1);
-        {
-            std::lock_guard<std::mutex> lock(mutex_);
-            parsed_ = k + 1;
-        }
+        lock.lock();
+        done_[k] = 1;
         changed_.notify_all();
     }
 }
@@ -72,18 +72,24 @@ void ParseAhead::Open(size_t k) {
     Module& m = d_.modules[order_[k]];
     if (!thread_.joinable()) {
         Parse(k, 0);
-    } else if (share_ && k % 2 == 1) {
-        {
-            std::lock_guard<std::mutex> lock(mutex_);
-            released_ = k;  // the thread may go on meanwhile
-        }
-        changed_.notify_all();
-        Parse(k, 0);
     } else {
         std::unique_lock<std::mutex> lock(mutex_);
         released_ = k;  // every module before k is done with
         changed_.notify_all();
-        changed_.wait(lock, [&] { return parsed_ > k; });
+        // Module k itself when the thread has not taken it; while the thread
+        // works on it, the next ones the slots allow. The two threads share
+        // the modules by how fast each goes.
+        while (!done_[k]) {
+            if (Claimable()) {
+                const size_t j = claimed_++;
+                lock.unlock();
+                Parse(j, 0);
+                lock.lock();
+                done_[j] = 1;
+            } else {
+                changed_.wait(lock, [&] { return done_[k] != 0; });
+            }
+        }
     }
     const Slot& s = slots_[k % kSlots];
     if (s.error == simdjson::MEMALLOC) throw std::bad_alloc();
