@@ -4,6 +4,7 @@
 
 #include <cstring>
 #include <string>
+#include <typeinfo>
 
 #include "Nlw_Verilog.h"
 #include "model/Nlw_Nl.h"
@@ -39,8 +40,8 @@ bool Nlw_VerilogLU::IsLegal(Port::String name, bool isBused) {
     if (nlw != nullptr && nlw->IsEscaped(name.c_str())) return true;
     // The base part of a bus-bit name goes to working buffers that every
     // call reuses: the legalizer asks this of every name in the design.
-    static std::string base;
-    static DARRAY_Util_INT32 indexes;
+    thread_local std::string base;
+    thread_local DARRAY_Util_INT32 indexes;
     const char* text = name.c_str();
     size_t length = name.length();
     if (isBused && Nlw_NlBus::IsBusName(text, base, &indexes)) {
@@ -54,6 +55,11 @@ bool Nlw_VerilogLU::IsLegal(Port::String name, bool isBused) {
             return false;
     }
     return true;
+}
+
+bool Nlw_VerilogLU::AnswersOnTwoThreads() const {
+    return typeid(*this) == typeid(Nlw_VerilogLU) &&
+           (nlw == nullptr || typeid(*nlw) == typeid(Nlw_Verilog));
 }
 
 Port::String Nlw_VerilogLU::Legalize(Port::String name, bool isBused) {

@@ -27,4 +27,7 @@ public:
 
 protected:
     bool UsesEscapedNames() const override { return writeEscapedNames; }
+    // When neither this class nor the writer asked is one derived from it:
+    // a derived class may answer its own way.
+    bool AnswersOnTwoThreads() const override;
 };

@@ -17,6 +17,7 @@
 #include <typeinfo>
 
 #include "Nlw_VerilogWriter.h"
+#include "framework/Nlw_Util.h"
 #include "model/Nlw_Nl.h"
 
 namespace {
@@ -45,20 +46,12 @@ std::vector<std::pair<size_t, size_t>> Runs(const std::vector<Nlw_NlBlock*>& blo
     return runs;
 }
 
-// NLW_WRITE_THREADS: 1 writes on one thread, 2 on two whatever the size
-// (one block per run); otherwise the size decides.
-int ThreadsAsked() {
-    const char* asked = Port_Env::GetEnv("NLW_WRITE_THREADS");
-    if (asked == nullptr) return 0;
-    return std::strcmp(asked, "1") == 0 ? 1 : std::strcmp(asked, "2") == 0 ? 2 : 0;
-}
-
 }  // namespace
 
 void Nlw_VerilogWriter::WriteBlocks(Nlw_NlView* view, const std::vector<Nlw_NlBlock*>& blocks) {
     size_t total = 0;
     for (const Nlw_NlBlock* block : blocks) total += Weight(block);
-    const int asked = ThreadsAsked();
+    const int asked = Nlw_Util::WriteThreadsAsked();
     // A class of its own may write blocks its own way; its copy would not.
     const bool two = typeid(*this) == typeid(Nlw_VerilogWriter) &&
                      (asked == 2 || (asked == 0 && total >= kTwoThreadsFrom &&

@@ -4,7 +4,10 @@
 
 #include <cstdio>
 #include <cstring>
+#include <exception>
 #include <string_view>
+#include <system_error>
+#include <thread>
 #include <unordered_map>
 #include <vector>
 
@@ -13,6 +16,7 @@
 #endif
 
 #include "framework/Nlw_NameTable.h"
+#include "framework/Nlw_Util.h"
 #include "model/Nlw_NlBuilder.h"
 
 namespace {
@@ -258,8 +262,56 @@ void Nlw_Nl_LU::Process() {
     if (view_ == nullptr) return;
     if (types_) ProcessTypes();
     if (cellPins_) ProcessCellPins();
-    if (names_)
-        for (Nlw_NlBlock* macro : view_->GetMacros()) ProcessMacro(macro);
+    if (names_) ProcessMacros();
+}
+
+// Each macro's names are its own: a macro renames its instances, ports,
+// nets and buses and nothing of any other macro. So the macros of a large
+// view are shared by two threads, the names the second gives kept apart
+// until the view goes.
+void Nlw_Nl_LU::ProcessMacros() {
+    // Below this many instances, pins and nets one thread does it all.
+    constexpr size_t kTwoThreadsFrom = 50000;
+    const auto& macros = view_->GetMacros();
+    auto weight = [](const Nlw_NlBlock* m) {
+        return 1 + m->GetChildren().size() + m->GetPinCount() + m->GetSignals().size();
+    };
+    size_t total = 0;
+    for (const Nlw_NlBlock* m : macros) total += weight(m);
+    const int asked = Nlw_Util::WriteThreadsAsked();
+    const bool two = AnswersOnTwoThreads() && macros.size() > 1 &&
+                     (asked == 2 || (asked == 0 && total >= kTwoThreadsFrom &&
+                                     std::thread::hardware_concurrency() > 1));
+    size_t cut = macros.size();
+    if (two) {
+        // The first half by weight here, the rest on the second thread.
+        size_t sum = 0;
+        for (cut = 0; cut + 1 < macros.size() && sum < total / 2; ++cut) sum += weight(macros[cut]);
+    }
+    std::exception_ptr failure;
+    std::thread helper;
+    if (cut < macros.size()) {
+        try {
+            helper = std::thread([&] {
+                try {
+                    Nlw_NlView::ThreadTexts texts(*view_);
+                    for (size_t i = cut; i < macros.size(); ++i) ProcessMacro(macros[i]);
+                } catch (...) {
+                    failure = std::current_exception();
+                }
+            });
+        } catch (const std::system_error&) {
+            cut = macros.size();  // no thread to be had: this one does it all
+        }
+    }
+    try {
+        for (size_t i = 0; i < cut; ++i) ProcessMacro(macros[i]);
+    } catch (...) {
+        if (helper.joinable()) helper.join();
+        throw;
+    }
+    if (helper.joinable()) helper.join();
+    if (failure) std::rethrow_exception(failure);
 }
 
 void Nlw_Nl_LU::ProcessTypes() {

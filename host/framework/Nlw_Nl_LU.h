@@ -62,6 +62,9 @@ protected:
     // Whether names will be escaped when written; a format that escapes
     // tells the walk so.
     virtual bool UsesEscapedNames() const { return true; }
+    // Whether IsLegal and Legalize may be asked from two threads at once:
+    // the macros of a large view are then walked on two.
+    virtual bool AnswersOnTwoThreads() const { return false; }
 
     Nlw_NlView* view_ = nullptr;
     bool types_ = true;
@@ -80,6 +83,7 @@ private:
     bool Prepare(const char* name, bool isBused, bool keywords, size_t limit, std::string& out,
                  bool formatRule = true);
     void ProcessTypes();
+    void ProcessMacros();
     void ProcessMacro(Nlw_NlBlock* macro);
     void ProcessCellPins();
 };

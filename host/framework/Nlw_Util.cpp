@@ -156,3 +156,9 @@ std::string Nlw_Util::CommentText(const char* text) {
     }
     return out;
 }
+
+int Nlw_Util::WriteThreadsAsked() {
+    const char* asked = Port_Env::GetEnv("NLW_WRITE_THREADS");
+    if (asked == nullptr) return 0;
+    return std::strcmp(asked, "1") == 0 ? 1 : std::strcmp(asked, "2") == 0 ? 2 : 0;
+}

@@ -71,4 +71,8 @@ public:
     // The part of the view as device data, or null when the view has none.
     // The caller deletes the result.
     static PM_PIC* CreatePicSpec(Nlw_NlView* view, bool flag);
+    // How many threads writing may use, as NLW_WRITE_THREADS asks: 1 keeps
+    // one thread, 2 takes two whatever the size of the work; 0 when it asks
+    // neither, and the size of the work decides.
+    static int WriteThreadsAsked();
 };

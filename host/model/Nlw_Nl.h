@@ -429,12 +429,28 @@ public:
     const char* Intern(const char* text);
     const char* Intern(const char* text, size_t len);
 
+    // While one lives, the texts the thread that made it gives any view
+    // (new names and also-known-as names of renamed objects) are kept in an
+    // arena of their own that lives as long as this view. Another thread
+    // may then rename objects of other macro blocks at the same time.
+    class ThreadTexts {
+    public:
+        explicit ThreadTexts(Nlw_NlView& view);
+        ~ThreadTexts();
+        ThreadTexts(const ThreadTexts&) = delete;
+        ThreadTexts& operator=(const ThreadTexts&) = delete;
+
+    private:
+        Nlw_NlArena* previous_;
+    };
+
 private:
     friend class Nlw_NlBuilder;
     friend class Nlw_NlType;
     struct TypeIndex;
     void DestroyBlock(Nlw_NlBlock* block);
     std::unique_ptr<Nlw_NlArena> arena_;
+    std::vector<std::unique_ptr<Nlw_NlArena>> threadArenas_;
     std::unique_ptr<TypeIndex> typeIndex_;
     Nlw_NlBlock* root_ = nullptr;
     UT_DARRAY<Nlw_NlBlock*> macros_;

@@ -92,7 +92,26 @@ void* Nlw_NlArena::Allocate(size_t size, size_t align) {
     return p;
 }
 
+namespace {
+
+// The arena a ThreadTexts gives this thread's texts to, if any.
+thread_local Nlw_NlArena* threadTexts = nullptr;
+std::mutex threadArenasMutex;
+
+}  // namespace
+
+Nlw_NlView::ThreadTexts::ThreadTexts(Nlw_NlView& view) : previous_(threadTexts) {
+    std::lock_guard<std::mutex> lock(threadArenasMutex);
+    view.threadArenas_.push_back(std::make_unique<Nlw_NlArena>());
+    threadTexts = view.threadArenas_.back().get();
+}
+
+Nlw_NlView::ThreadTexts::~ThreadTexts() {
+    threadTexts = previous_;
+}
+
 const char* Nlw_NlArena::Copy(const char* text, size_t len) {
+    if (threadTexts != nullptr && threadTexts != this) return threadTexts->Copy(text, len);
     char* p = static_cast<char*>(Allocate(len + 1, 1));
     if (len) std::memcpy(p, text, len);
     p[len] = '\0';

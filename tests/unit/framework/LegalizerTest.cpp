@@ -23,7 +23,7 @@ public:
         : Nlw_Nl_LU(view, types, names, cellPins, bridge), escaped_(escaped) {}
 
     bool IsLegal(Port::String name, bool isBused) override {
-        asked.push_back(std::string(name.c_str()) + (isBused ? " (bit)" : ""));
+        if (!twoThreads) asked.push_back(std::string(name.c_str()) + (isBused ? " (bit)" : ""));
         return Split(name, isBused).first.find('-') == std::string::npos;
     }
     Port::String Legalize(Port::String name, bool isBused) override {
@@ -34,9 +34,11 @@ public:
     }
 
     Names asked;
+    bool twoThreads = false;  // then nothing is recorded
 
 protected:
     bool UsesEscapedNames() const override { return escaped_; }
+    bool AnswersOnTwoThreads() const override { return twoThreads; }
 
 private:
     static std::pair<std::string, std::string> Split(const Port::String& name, bool isBused) {
@@ -200,6 +202,31 @@ TEST_F(Legalizer, MakesInstanceNamesUniqueGivingTheLaterOneASuffix) {
         DashLU(&d.view, true).Process();
         EXPECT_EQ(nlwtest::Bracketed(Instances(d.top)), c[1]) << c[0];
     }
+}
+
+// Macros walked on two threads get the names one thread gives them: each
+// renames its own instances, ports and nets, the parent its child macros.
+TEST_F(Legalizer, GivesTheNamesOfOneThreadOnTwo) {
+    auto legalized = [](const char* threads) {
+        nlwtest::ScopedEnv env("NLW_WRITE_THREADS", threads);
+        Design d;
+        Nlw_NlType* sub = d.b.AddModuleType("sub-m");
+        for (int i = 0; i < 6; ++i) {
+            Nlw_NlBlock* m = d.b.CreateMacro(d.top, sub, i % 2 ? "s-1" : "s_1");
+            d.b.AddPort(m, "p-a", NLW_DIR_INPUT);
+            d.b.AddPortBus(m, "p_a", NLW_DIR_OUTPUT, 1, 0);
+            d.b.AddSignal(m, "n-1");
+            d.b.GetSignalBusMember(d.b.AddSignalBus(m, "n_1", 2, 0), 1);
+            for (const char* name : {"u-1", "u_1", "p_a", "u-1"}) d.b.CreateLeaf(m, d.cell, name);
+        }
+        DashLU lu(&d.view, true);
+        lu.twoThreads = true;
+        lu.Process();
+        return nlwtest::TypesText(d.view) + nlwtest::ModelText(d.view);
+    };
+    const std::string one = legalized("1");
+    EXPECT_EQ(legalized("2"), one);
+    EXPECT_NE(one.find("u_1_2"), std::string::npos) << one;
 }
 
 TEST_F(Legalizer, LetsAPortShareItsNameOnlyWithItsOwnInsideSignal) {
