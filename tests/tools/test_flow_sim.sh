@@ -2,8 +2,8 @@
 # End-to-end checks of the default installation, the RTL flow and qdb2ver:
 #
 #  1. the cell library agrees with the installation's data files, compiles
-#     with Icarus Verilog and passes Verilator's lint (lib/check_cells.py);
-#     the timing and functional models behave alike (lib/compare_models.py);
+#     with Icarus Verilog and passes Verilator's lint (lib/cells.py check);
+#     the timing and functional models behave alike (lib/cells.py compare);
 #     the timing models pass directed checks (tests/data/cells_directed_tb.v);
 #  2. every design under tests/data/designs/, and the committed example, goes
 #     RTL -> flow/rtl2json -> qdb2ver -ism -> one netlist file that Icarus
@@ -37,8 +37,8 @@ qdb2ver=$bin/qdb2ver
 
 # ---------------------------------------------------------------------------
 # 1. The cell library.
-check "cell library" python3 "$tools/lib/check_cells.py" "$share" cells
-check "timing and functional models alike" python3 "$tools/lib/compare_models.py" "$share" models
+check "cell library" python3 "$tools/lib/cells.py" check "$share" cells
+check "timing and functional models alike" python3 "$tools/lib/cells.py" compare "$share" models
 check "directed checks of the timing models" eval "iverilog -g2005 -gspecify -o directed.vvp \
     -s cells_directed_tb -s chipwide -y $timcells $data/cells_directed_tb.v $chipwide &&
     vvp -n directed.vvp | tee directed.log && grep -q '^directed: [0-9]* checks, 0 failures' directed.log"
@@ -54,7 +54,7 @@ directives() { sed -n "s|^// nlw-test: $2 *\(.*\)\$|\1|p" "$1"; }
 make_netlists() {  # JSON DIR
     if [ "$yosys_netlist" = 1 ]; then
         yosys -q -p "read_json $1; write_verilog -noattr $2/plain.v" &&
-            { echo '`timescale 1 ns/1 ps'; cat $(python3 "$tools/lib/model_files.py" "$share" "$1") \
+            { echo '`timescale 1 ns/1 ps'; cat $(python3 "$tools/lib/cells.py" models "$share" "$1") \
                 "$2/plain.v" "$chipwide"; } > "$2/net.v"
         return
     fi
