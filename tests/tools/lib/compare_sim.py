@@ -10,56 +10,28 @@ unknown); every other bit must be equal. Prints the first mismatches and
 a one-line summary; exits 1 on any mismatch or when the netlist simulation
 printed fewer cycles.
 """
-
 import sys
 
 
 def read(path):
-    rows = []
-    with open(path) as f:
-        for line in f:
-            words = line.split()
-            if words and words[0].isdigit():
-                rows.append((int(words[0]), dict(w.split("=", 1) for w in words[1:])))
-    return rows
+    rows = [line.split() for line in open(path)]
+    return [(int(w[0]), dict(x.split("=", 1) for x in w[1:])) for w in rows if w and w[0].isdigit()]
 
 
 def matches(want, got):
-    want, got = want.lower(), got.lower()
-    if want == "x":
-        return True
-    if want == "z":
-        return got in "zx"
-    return want == got
+    return want == "x" or (got in "zx" if want == "z" else want == got)
 
 
-def main():
-    ref, net = read(sys.argv[1]), read(sys.argv[2])
-    shown = 0
-    bad_cycles = 0
-    if not ref:
-        print("no cycles in the reference simulation")
-        return 1
-    if len(net) != len(ref):
-        print(f"the reference printed {len(ref)} cycles, the netlist {len(net)}")
-        return 1
-    for (cycle, want), (_, got) in zip(ref, net):
-        bad = []
-        for name, bits in want.items():
-            other = got.get(name)
-            if other is None or len(other) != len(bits):
-                bad.append(f"{name}: {bits} vs {other}")
-                continue
-            if any(not matches(w, g) for w, g in zip(bits, other)):
-                bad.append(f"{name}: {bits} vs {other}")
-        if bad:
-            bad_cycles += 1
-            if shown < 5:
-                print(f"cycle {cycle}: " + "; ".join(bad))
-                shown += 1
-    print(f"{len(ref)} cycles, {bad_cycles} with mismatches")
-    return 1 if bad_cycles else 0
-
-
-if __name__ == "__main__":
-    sys.exit(main())
+ref, net = read(sys.argv[1]), read(sys.argv[2])
+if not ref or len(net) != len(ref):
+    sys.exit(f"the reference printed {len(ref)} cycles, the netlist {len(net)}")
+bad_cycles = 0
+for (cycle, want), (_, got) in zip(ref, net):
+    bad = [f"{name}: {bits} vs {got.get(name)}" for name, bits in want.items()
+           if len(got.get(name, "")) != len(bits)
+           or not all(matches(w, g) for w, g in zip(bits.lower(), got[name].lower()))]
+    if bad and bad_cycles < 5:
+        print(f"cycle {cycle}: " + "; ".join(bad))
+    bad_cycles += bool(bad)
+print(f"{len(ref)} cycles, {bad_cycles} with mismatches")
+sys.exit(1 if bad_cycles else 0)
