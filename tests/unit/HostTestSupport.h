@@ -2,21 +2,13 @@
 // environment settings and minimal writer classes.
 #pragma once
 
-#include <gtest/gtest.h>
-#include <stdlib.h>
-#include <sys/stat.h>
 #include <unistd.h>
 
 #include <cstdio>
-#include <filesystem>
-#include <fstream>
-#include <sstream>
-#include <string>
 
 #include "TestFiles.h"
 #include "framework/Nlw_NetlistWriter.h"
 #include "framework/Nlw_Writer.h"
-#include "port/Port.h"
 
 namespace hosttest {
 

@@ -1,8 +1,3 @@
-#include <gtest/gtest.h>
-
-#include <string>
-#include <vector>
-
 #include "Nlw_CommandLine.h"
 #include "TestFiles.h"
 

@@ -1,9 +1,6 @@
 // The host legalizer's walk, with a small format that only refuses '-'.
-#include <gtest/gtest.h>
 
-#include <string>
 #include <type_traits>
-#include <vector>
 
 #include "ModelText.h"
 #include "TestFiles.h"

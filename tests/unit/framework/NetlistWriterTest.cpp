@@ -2,14 +2,7 @@
 // table; services on the netlist model: external property lists,
 // instantiability, the view's part and the netlist dump.
 
-#include <gtest/gtest.h>
-
-#include <string>
-#include <vector>
-
 #include "HostTestSupport.h"
-#include "TestFiles.h"
-#include "framework/Nlw_NetlistWriter.h"
 #include "framework/Nlw_Util.h"
 #include "model/Nlw_NlBuilder.h"
 

@@ -1,17 +1,11 @@
 // The file writer base: text layout, buffering, the temporary file, access
 // modes and failures; the property output filter.
-#include <gtest/gtest.h>
 #include <signal.h>
 #include <sys/resource.h>
-#include <sys/stat.h>
-#include <unistd.h>
-
-#include <string>
 
 #include "HostTestSupport.h"
 #include "framework/Nlw_FileRun.h"
 #include "framework/Nlw_FileSafety.h"
-#include "framework/Nlw_Writer.h"
 
 namespace {
 

@@ -5,11 +5,9 @@
 // rows.
 
 #include <map>
-#include <vector>
 
 #include "Nlw_PcsWriter.h"
 #include "Nlw_PinWriter.h"
-#include "TestFiles.h"
 #include "VerilogWriterTest.h"
 
 struct Nlw_PcsWriterTestPeer {

@@ -2,7 +2,6 @@
 // closing notices, observed through the files and messages a run leaves.
 #include <algorithm>
 
-#include "TestFiles.h"
 #include "VerilogWriterTest.h"
 #include "framework/Nlw_Nl_LU.h"
 

@@ -3,7 +3,6 @@
 // timing annotation statement; the chipwide module, the device-data maps and
 // the included cell models.
 
-#include "TestFiles.h"
 #include "VerilogWriterTest.h"
 #include "framework/Nlw_Writer.h"
 

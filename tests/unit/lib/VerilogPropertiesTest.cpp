@@ -1,10 +1,7 @@
 // Simulatable property conversion: cell properties checked against the
 // simulation library's parameter definitions and turned into Verilog values.
-#include <gtest/gtest.h>
 
 #include <memory>
-#include <string>
-#include <vector>
 
 #include "ModelText.h"
 #include "Nlw_Verilog.h"

@@ -1,11 +1,8 @@
 // The test fixture writer: file head, port declarations, unit under test,
 // waveform dumps, the column header with its monitor and the stimulus (the
 // run that writes it: test_programs.sh and the option rows).
-#include <string>
-#include <vector>
 
 #include "Nlw_VerilogTestWriter.h"
-#include "TestFiles.h"
 #include "VerilogWriterTest.h"
 
 namespace {

@@ -1,11 +1,7 @@
 // Identifier escaping, bus range and index text, reserved words, the name
 // legalizer and the usage texts.
 
-#include <gtest/gtest.h>
-
 #include <cstdio>
-#include <string>
-#include <vector>
 
 #include "Nlw_Verilog.h"
 #include "Nlw_VerilogLU.h"

@@ -2,7 +2,6 @@
 // wires and the assign statement, instance statements and port maps, cell
 // parameters.
 
-#include "TestFiles.h"
 #include "VerilogWriterTest.h"
 
 namespace {

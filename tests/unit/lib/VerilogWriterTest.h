@@ -3,13 +3,7 @@
 // collect their text in memory.
 #pragma once
 
-#include <gtest/gtest.h>
-#include <stdlib.h>
-
-#include <filesystem>
-#include <fstream>
 #include <memory>
-#include <string>
 
 #include "Nlw_Verilog.h"
 #include "Nlw_VerilogWriter.h"
@@ -17,7 +11,6 @@
 #include "framework/Nlw_Params.h"
 #include "framework/Nlw_Util.h"
 #include "model/Nlw_NlBuilder.h"
-#include "port/Port.h"
 
 namespace vwtest {
 

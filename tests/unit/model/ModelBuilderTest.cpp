@@ -2,14 +2,8 @@
 // lookup by alias, signal pin lists, drivers and networks; bus settings,
 // bus-bit name splitting and index tuple walks.
 
-#include <gtest/gtest.h>
-
-#include <string>
-#include <vector>
-
 #include "TestFiles.h"
 #include "model/Nlw_NlBuilder.h"
-#include "port/Port.h"
 
 namespace {
 

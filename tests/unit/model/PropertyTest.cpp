@@ -1,7 +1,4 @@
 // Properties, property holders, the type library and the small helpers.
-#include <gtest/gtest.h>
-
-#include <string>
 
 #include "HostTestSupport.h"
 #include "ModelText.h"

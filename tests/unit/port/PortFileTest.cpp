@@ -1,15 +1,8 @@
 // Files, line reading, installation roots, data file lookup, parts and
 // device data sets.
 
-#include <gtest/gtest.h>
-#include <sys/stat.h>
-
-#include <string>
-#include <vector>
-
 #include "HostTestSupport.h"
 #include "port/PM.h"
-#include "port/Port.h"
 
 namespace {
 

@@ -1,14 +1,7 @@
 // Formatted text, the host string, C-string helpers, wildcard matching,
 // path helpers, the name cache and the message manager.
 
-#include <gtest/gtest.h>
-
-#include <string>
-#include <vector>
-
 #include "HostTestSupport.h"
-#include "TestFiles.h"
-#include "port/Port.h"
 #include "port/UT.h"
 
 namespace {

@@ -2,19 +2,12 @@
 // preparation pass with its value conversions, Verilog literals and property
 // table; the timing file reader, the Liberty reader and the nominal delays.
 
-#include <gtest/gtest.h>
-
 #include <cmath>
-#include <memory>
-#include <string>
-#include <vector>
 
 #include "HostTestSupport.h"
 #include "ReaderTestSupport.h"
-#include "framework/Nlw_NetlistWriter.h"
 #include "framework/Nlw_Timing.h"
 #include "framework/Nlw_Util.h"
-#include "model/Nlw_Nl.h"
 #include "reader/Nlw_CellLibrary.h"
 #include "reader/Nlw_Liberty.h"
 #include "reader/Nlw_NominalTiming.h"

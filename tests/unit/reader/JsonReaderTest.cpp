@@ -2,10 +2,7 @@
 // cells, their parameters, pins, pads and globals; the module hierarchy;
 // layouts of the text; faulty and corrupted input.
 
-#include <gtest/gtest.h>
-
 #include <random>
-#include <string>
 
 #include "ReaderTestSupport.h"
 

@@ -2,21 +2,13 @@
 // installation with chosen data files, and model lookups.
 #pragma once
 
-#include <gtest/gtest.h>
-#include <stdlib.h>
 #include <unistd.h>
 
-#include <cstdlib>
-#include <fstream>
 #include <memory>
-#include <sstream>
-#include <string>
-#include <vector>
 
 #include "ModelText.h"
 #include "TestFiles.h"
 #include "model/Nlw_Nl.h"
-#include "port/Port.h"
 #include "reader/Nlw_JsonReader.h"
 
 namespace readertest {

@@ -1,9 +1,6 @@
 // The timing file writer: names as the netlist writes them, SDF escaping,
 // hierarchy, time scale, value triples and the three ways of writing net
 // delays, against one golden file.
-#include <gtest/gtest.h>
-
-#include <string>
 
 #include "HostTestSupport.h"
 #include "framework/Nlw_Timing.h"
