@@ -14,9 +14,8 @@
 #     top-level parameter overrides and pin constraints go through the
 #     flow, and the pin map lists every constrained port; below the top the
 #     flow's nets are single bits, buses with -keepbuses;
-#  3. qdb2ver's installation lookups: the `uselib directive of -ul, models
-#     and the chipwide module found along a list of installation roots, and
-#     the messages for missing ones.
+#  3. qdb2ver's installation lookups: models and the chipwide module found
+#     along a list of installation roots, and the messages for missing ones.
 #
 # Options: --yosys-netlist checks yosys's own netlist writer instead of
 # qdb2ver (parts 1 and 2 only); --keep keeps the work directory; further
@@ -152,16 +151,6 @@ fi
 # ---------------------------------------------------------------------------
 # 3. Installation lookups of qdb2ver.
 json=$src/examples/counter/counter.json
-# -ul names the timing models of the default installation: the share
-# directory beside the program, else the source tree's; the netlist ends
-# with a bare `uselib line.
-expected=$timcells
-[ -d "$bin/../share/verilog/src" ] && expected="$bin/../share/verilog/src/timcells"
-check "-ul: written" run 0 "$qdb2ver" -ul -w "$json" ul.v
-dir=$(sed -n 's/^`uselib dir=\(.*\) libext=\.v$/\1/p' ul.v | head -n 1)
-check "-ul: the uselib line names '$expected'" test "$(realpath "${dir:-/none}")" = "$(realpath "$expected")"
-check "-ul: ends with a bare uselib line" test "$(grep -v '^$' ul.v | tail -n 1)" = '`uselib'
-
 # Two roots: the first holds only one model, the second the whole
 # installation with its own chipwide module. A missing root and a root that
 # is a plain file are passed over.

@@ -42,7 +42,8 @@ path, top, cycles, seed = sys.argv[1], sys.argv[2], int(sys.argv[3]), int(sys.ar
 params = [a.split("=", 1) for a in sys.argv[5:]]
 ports = list(json.load(open(path))["modules"][top]["ports"].items())
 rng = random.Random(seed)
-clocks = [n for n, p in ports if p["direction"] == "input" and len(p["bits"]) == 1 and CLOCK.match(n)]
+clocks = [n for n, p in ports
+          if p["direction"] == "input" and len(p["bits"]) == 1 and CLOCK.match(n)]
 shown = [n for n, p in ports if p["direction"] in ("output", "inout")]
 driven = [(n, p) for n, p in ports if p["direction"] == "input" and n not in clocks]
 driven += [("drive_" + n, p) for n, p in ports if p["direction"] == "inout"]
@@ -68,14 +69,17 @@ for cycle in range(cycles):
         values.append(f"    {esc(name)} = {width}'h{value:x};")
     # The first values hold from the start, so that no input is unknown
     # when the global set/reset ends.
-    out += (values if cycle == 0 else []) + [f"    #{START + 5 if cycle == 0 else PERIOD};"] + values
+    out += (values if cycle == 0 else []) + [f"    #{START + 5 if cycle == 0 else PERIOD};"]
+    out += values
 out += [f"    #{PERIOD};", "    $finish;", "  end", ""]
 if clocks:
     flips = " ".join(f"{esc(c)} = ~{esc(c)};" for c in clocks)
-    out += ["  initial begin", f"    #{START};", f"    forever begin #{PERIOD // 2}; {flips} end", "  end", ""]
+    out += ["  initial begin", f"    #{START};", f"    forever begin #{PERIOD // 2}; {flips} end",
+            "  end", ""]
 fmt = "".join(f" {n}=%b" for n in shown)
 args = "".join(f", {esc(n)}" for n in shown)
 out += ["  integer cycle;", "  initial begin", f"    #{START + PERIOD // 2 - 1};",
         f"    for (cycle = 0; cycle < {cycles}; cycle = cycle + 1) begin",
-        f'      $display("%0d{fmt}", cycle{args});', f"      #{PERIOD};", "    end", "  end", "endmodule"]
+        f'      $display("%0d{fmt}", cycle{args});', f"      #{PERIOD};", "    end", "  end",
+        "endmodule"]
 print("\n".join(out))

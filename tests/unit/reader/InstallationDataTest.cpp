@@ -70,19 +70,6 @@ TEST(CellLibrary, ReportsAnUnreadableFile) {
     EXPECT_TRUE(Contains(error, "none.dat")) << error;
 }
 
-TEST(CellLibrary, ReadsTheInstallationLibrary) {
-    Nlw_CellLibrary lib;
-    std::string error;
-    ASSERT_TRUE(lib.Load(NLW_TEST_DATA_DIR "/../../share/data/cells.dat", error)) << error;
-    const Nlw_CellDef* lut = lib.Find("V_LUT4");
-    const Nlw_CellDef* fd = lib.Find("V_FD");
-    ASSERT_TRUE(lut && fd);
-    EXPECT_EQ(lut->pins.size(), 5u);
-    std::string pins = " ";
-    for (const Nlw_CellPinDef& p : fd->pins) pins += p.name + " ";
-    for (const char* pin : {" C ", " D ", " Q "}) EXPECT_TRUE(Contains(pins, pin)) << pins;
-}
-
 // ---------------------------------------------------------------------------
 // The preparation pass: value conversions, Verilog literals, external
 // property lists and the installation's property table.
