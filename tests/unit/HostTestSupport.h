@@ -12,14 +12,7 @@
 
 namespace hosttest {
 
-using nlwtest::Exists;
-using nlwtest::ReadFile;
-using nlwtest::TempDir;
-using nlwtest::WriteFile;
-
-inline void MakeDirs(const std::string& path) {
-    std::filesystem::create_directories(path);
-}
+using namespace nlwtest;
 
 // Names in dir, one per line, sorted.
 inline std::string ListDir(const std::string& dir) {
@@ -30,8 +23,6 @@ inline std::string ListDir(const std::string& dir) {
     if (p) ::pclose(p);
     return out;
 }
-
-using EnvSetting = nlwtest::ScopedEnv;
 
 // Keeps expected messages off the terminal while capturing them.
 class QuietCapture : public Port_MsgCapture {

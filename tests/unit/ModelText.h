@@ -72,9 +72,8 @@ inline std::string ModelText(const Nlw_NlView& view) {
         }
         if (const auto* buses = m->GetSignalBuses())
             for (const Nlw_NlBus* b : *buses)
-                out +=
-                    vorform("  bus %s[%d:%d]%s\n", b->GetWritableName(), b->GetMSB(0), b->GetLSB(0),
-                            b->GetAka() ? (std::string(" aka '") + b->GetAka() + "'").c_str() : "");
+                out += vorform("  bus %s[%d:%d]%s\n", b->GetWritableName(), b->GetMSB(0),
+                               b->GetLSB(0), NameAndAka("", b->GetAka()).c_str());
         for (const Nlw_NlBlock* c : m->GetChildren()) {
             out += "  " + std::string(c->IsMacro() ? "instance " : "cell ") + c->GetTypeName() +
                    " " + NameAndAka(c->GetInstanceName(), c->GetAka());

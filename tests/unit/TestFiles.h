@@ -30,7 +30,6 @@ public:
     ~TempDir() { std::system(("rm -rf '" + path_ + "'").c_str()); }
     TempDir(const TempDir&) = delete;
     TempDir& operator=(const TempDir&) = delete;
-    const std::string& path() const { return path_; }
     const std::string& Path() const { return path_; }
     std::string operator/(const std::string& name) const { return path_ + "/" + name; }
     // Writes a file below the directory, creating its parents.

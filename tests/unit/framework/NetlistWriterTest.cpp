@@ -31,9 +31,8 @@ TEST(NetlistWriter, PadOrTrimKeepsLeastSignificantDigits) {
 
 TEST(NetlistWriter, DevkeyWithoutViewUsesAnEmptyPart) {
     TempDir dir;
-    MakeDirs(dir / "data");
-    WriteFile(dir / "data/device.key", "HexStringProperty = INIT\n");
-    EnvSetting root("VORNIX", dir.path().c_str());
+    dir.File("data/device.key", "HexStringProperty = INIT\n");
+    ScopedEnv root("VORNIX", dir.Path().c_str());
     StubNetlistWriter nlw;
     EXPECT_STREQ(nlw.GetPmPic()->get_partname(), "");
     PM_DEVKEY* key = nlw.GetDevkey();
@@ -76,7 +75,7 @@ TEST(NetlistWriter, BadOrMissingTableChangesNothing) {
     EXPECT_FALSE(nlw.LoadSimPropTable((dir / "none.tbl").c_str()));
     EXPECT_FALSE(nlw.LoadSimPropTable(nullptr));
     EXPECT_TRUE(capture.msgs.empty());
-    EXPECT_FALSE(nlw.LoadSimPropTable(dir.path().c_str()));
+    EXPECT_FALSE(nlw.LoadSimPropTable(dir.Path().c_str()));
     EXPECT_EQ(capture.Count(Port_MsgLevel::Error), 1u);
 }
 
@@ -224,7 +223,7 @@ TEST(NetlistWriterModel, DumpListsTheNetlist) {
     EXPECT_EQ(
         capture.Texts(Port_MsgLevel::Status),
         std::vector<std::string>{"Writing netlist dump file '" + dir / "top.nlw" + "' ...\n"});
-    EXPECT_EQ(hosttest::ListDir(dir.path()), "top.nlw\n");
+    EXPECT_EQ(hosttest::ListDir(dir.Path()), "top.nlw\n");
     // Without an output name there is nowhere to write it.
     StubNetlistWriter nameless;
     nameless.SetView(&d.view);

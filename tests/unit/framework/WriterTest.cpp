@@ -66,10 +66,10 @@ TEST(Writer, FileGetsExactlyTheTextOnlyWhenClosed) {
     }
     ASSERT_GT(expected.size(), 3 * Nlw_Writer::kFlushSize);
     EXPECT_FALSE(Exists(path));
-    EXPECT_EQ(ListDir(dir.path()), "top.v.tmp" + std::to_string(::getpid()) + "\n");
+    EXPECT_EQ(ListDir(dir.Path()), "top.v.tmp" + std::to_string(::getpid()) + "\n");
     EXPECT_TRUE(w.Close());
     EXPECT_EQ(ReadFile(path), expected);
-    EXPECT_EQ(ListDir(dir.path()), "top.v\n");
+    EXPECT_EQ(ListDir(dir.Path()), "top.v\n");
     EXPECT_TRUE(w.Close());  // closing again changes nothing
 }
 
@@ -85,7 +85,7 @@ TEST(Writer, CreateRefusesAnExistingFileAndKeepsIt) {
         EXPECT_FALSE(w.Close());
     }
     EXPECT_EQ(ReadFile(path), "precious\n");
-    EXPECT_EQ(ListDir(dir.path()), "top.v\n");
+    EXPECT_EQ(ListDir(dir.Path()), "top.v\n");
     EXPECT_EQ(
         capture.Texts(Port_MsgLevel::Error),
         std::vector<std::string>{"Output file '" + path + "' exists; use -w to overwrite it.\n"});
@@ -98,7 +98,7 @@ TEST(Writer, CreateRefusesAnExistingFileAndKeepsIt) {
         WriteFile(path, "someone else's\n");
     }
     EXPECT_EQ(ReadFile(path), "someone else's\n");
-    EXPECT_EQ(ListDir(dir.path()), "top.v\n");
+    EXPECT_EQ(ListDir(dir.Path()), "top.v\n");
     EXPECT_EQ(capture.Count(Port_MsgLevel::Error), 2u);
 }
 
@@ -120,7 +120,7 @@ TEST(Writer, ReplaceReplacesAnExistingFile) {
 TEST(Writer, UnwritablePlacesGiveOneErrorAndNoFile) {
     TempDir dir;
     WriteFile(dir / "plain", "x");
-    hosttest::MakeDirs(dir / "sub");
+    dir.Dir("sub");
     for (const nlwtest::Row& c : nlwtest::Table("unwritable")) {
         const std::string path = c[0].empty() ? "" : dir / c[0];
         const Port::Stream::Access access = c[1] == "c"      ? Port::Stream::Create
@@ -137,7 +137,7 @@ TEST(Writer, UnwritablePlacesGiveOneErrorAndNoFile) {
                   std::vector<std::string>{"Cannot write file '" + path + "': " + c[2] + "\n"});
         EXPECT_EQ(capture.msgs.size(), 1u);
     }
-    EXPECT_EQ(ListDir(dir.path()), "plain\nsub\n");
+    EXPECT_EQ(ListDir(dir.Path()), "plain\nsub\n");
     EXPECT_EQ(ListDir(dir / "sub"), "");
 }
 
@@ -156,8 +156,7 @@ TEST(Writer, DevicesAreWrittenInPlace) {
 
 TEST(Writer, ReplaceThroughALinkKeepsTheLink) {
     TempDir dir;
-    hosttest::MakeDirs(dir / "real");
-    WriteFile(dir / "real/top.v", "old\n");
+    dir.File("real/top.v", "old\n");
     ASSERT_EQ(::symlink((dir / "real/top.v").c_str(), (dir / "top.v").c_str()), 0);
     {
         PlainWriter w(nullptr, (dir / "top.v").c_str(), Port::Stream::Replace);
@@ -208,7 +207,7 @@ TEST(Writer, FailedWriteLeavesOldFileAndNoTemporary) {
         EXPECT_FALSE(w.Close());
     }
     EXPECT_EQ(ReadFile(path), "old netlist\n");
-    EXPECT_EQ(ListDir(dir.path()), "top.v\n");
+    EXPECT_EQ(ListDir(dir.Path()), "top.v\n");
     EXPECT_EQ(capture.Texts(Port_MsgLevel::Error),
               std::vector<std::string>{"Cannot write file '" + path + "': File too large\n"});
 }
@@ -224,7 +223,7 @@ TEST(Writer, FailureAtCloseIsReported) {
         EXPECT_FALSE(w.Close());
     }
     EXPECT_FALSE(Exists(path));
-    EXPECT_EQ(ListDir(dir.path()), "");
+    EXPECT_EQ(ListDir(dir.Path()), "");
     EXPECT_EQ(capture.Count(Port_MsgLevel::Error), 1u);
 }
 
@@ -289,7 +288,7 @@ TEST(WriterRun, PlacesAllFilesOrNone) {
         EXPECT_EQ(committed, fault == kNone);
         EXPECT_EQ(ReadFile(dir / "top.pin"), fault == kNone ? "new pin\n" : "old pin\n");
         const char* const kLeft[] = {"top.pin\ntop.tv\ntop.v\n", "top.pin\n", "top.pin\ntop.v\n"};
-        EXPECT_EQ(ListDir(dir.path()), kLeft[fault]);
+        EXPECT_EQ(ListDir(dir.Path()), kLeft[fault]);
         if (fault == kNone) {
             EXPECT_EQ(ReadFile(dir / "top.tv"), "new tv\n");
         }
@@ -304,7 +303,7 @@ TEST(WriterRun, PlacesAllFilesOrNone) {
 // existing file (its folder moved away meanwhile) says that reason.
 TEST(WriterRun, PlacementFailureNamesItsReason) {
     TempDir dir;
-    hosttest::MakeDirs(dir / "sub");
+    dir.Dir("sub");
     QuietCapture capture;
     Nlw_FileRun run;
     PlainWriter w(nullptr, (dir / "sub/top.v").c_str(), Port::Stream::Create);

@@ -14,8 +14,7 @@
 
 namespace vwtest {
 
-using nlwtest::ScopedEnv;
-using nlwtest::TempDir;
+using namespace nlwtest;
 
 // The error of a run without an installation root.
 const char* const kNoVornix =

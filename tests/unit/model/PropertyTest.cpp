@@ -88,14 +88,14 @@ TEST(NlwUtil, IntAndStringProperties) {
 
 TEST(NlwUtil, TimeStampSources) {
     {
-        hosttest::EnvSetting env("NLW_TIMESTAMP", "Thu Jan  1 00:00:00 2026");
+        nlwtest::ScopedEnv env("NLW_TIMESTAMP", "Thu Jan  1 00:00:00 2026");
         EXPECT_STREQ(Nlw_Util::GetTimeStampString(1), "Thu Jan  1 00:00:00 2026");
         Nlw_Util::SetFixedTimeStamp("fixed");
         EXPECT_STREQ(Nlw_Util::GetTimeStampString(1), "fixed");
         Nlw_Util::SetFixedTimeStamp(nullptr);
         EXPECT_STREQ(Nlw_Util::GetTimeStampString(1), "Thu Jan  1 00:00:00 2026");
     }
-    hosttest::EnvSetting env("NLW_TIMESTAMP", nullptr);
+    nlwtest::ScopedEnv env("NLW_TIMESTAMP", nullptr);
     std::string now = Nlw_Util::GetTimeStampString(1);
     // "Sun Dec  6 10:51:33 2026": day, month, space-padded day of month.
     ASSERT_EQ(now.size(), 24u) << now;

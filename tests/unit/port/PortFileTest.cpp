@@ -32,14 +32,14 @@ TEST(PortFile, ExistOpenAndReadAll) {
     std::string big(300000, 'b');
     WriteFile(file, big);
     EXPECT_TRUE(Port::File::exist(file.c_str()) && !Port::File::isdir(file.c_str()));
-    EXPECT_TRUE(Port::File::exist(dir.path().c_str()) && Port::File::isdir(dir.path().c_str()));
+    EXPECT_TRUE(Port::File::exist(dir.Path().c_str()) && Port::File::isdir(dir.Path().c_str()));
     EXPECT_FALSE(Port::File::exist(none.c_str()) || Port::File::isdir(none.c_str()));
     EXPECT_FALSE(Port::File::exist(nullptr) || Port::File::exist(""));
 
     // Missing files and directories are not opened.
     Port::Stream stream(Port::Stream::Read, 4096);
     EXPECT_FALSE(Port::File::open(none.c_str(), stream, 0));
-    EXPECT_FALSE(Port::File::open(dir.path().c_str(), stream, 0));
+    EXPECT_FALSE(Port::File::open(dir.Path().c_str(), stream, 0));
     EXPECT_FALSE(stream.isOpen());
     char buf[8];
     EXPECT_EQ(stream.readline(buf, sizeof buf), 0);
@@ -49,7 +49,7 @@ TEST(PortFile, ExistOpenAndReadAll) {
     EXPECT_EQ(content, big);
     EXPECT_FALSE(Port::File::readAll(none.c_str(), content, &error));
     EXPECT_EQ(error, "No such file or directory");
-    EXPECT_FALSE(Port::File::readAll(dir.path().c_str(), content, &error));
+    EXPECT_FALSE(Port::File::readAll(dir.Path().c_str(), content, &error));
 }
 
 TEST(PortStream, ReadlineStripsLineEnds) {
@@ -109,7 +109,7 @@ TEST(VornixPath, SplitsTheVariable) {
         {nullptr, {NLW_SOURCE_SHARE_DIR}},
     };
     for (const auto& c : cases) {
-        EnvSetting v("VORNIX", c.first);
+        ScopedEnv v("VORNIX", c.first);
         const Port::PathList& roots = Port::VornixPath::GetInstance();
         std::vector<std::string> got;
         for (size_t i = 0; i < roots.size(); ++i) got.push_back(roots[i]);
@@ -120,7 +120,7 @@ TEST(VornixPath, SplitsTheVariable) {
 }
 
 TEST(VornixPath, CachedUntilReset) {
-    EnvSetting v("VORNIX", "/first");
+    ScopedEnv v("VORNIX", "/first");
     const Port::PathList& before = Port::VornixPath::GetInstance();
     ::setenv("VORNIX", "/second", 1);
     EXPECT_STREQ(Port::VornixPath::GetInstance()[0], "/first");
@@ -134,16 +134,15 @@ TEST(VornixPath, LooksUpInTheFirstRootHoldingThePath) {
     TempDir dir;
     // r0 is a file, not a root; r1 holds "lib" as a file and "m.v" as a
     // directory, so both lookups must go on to r2.
-    WriteFile(dir / "r0", "x");
-    MakeDirs(dir / "r1/src/m.v");
-    WriteFile(dir / "r1/src/lib", "x");
-    MakeDirs(dir / "r2/src/lib");
-    WriteFile(dir / "r2/src/m.v", "second\n");
-    MakeDirs(dir / "r3/src");
-    WriteFile(dir / "r3/src/m.v", "third\n");
+    dir.File("r0", "x");
+    dir.Dir("r1/src/m.v");
+    dir.File("r1/src/lib", "x");
+    dir.Dir("r2/src/lib");
+    dir.File("r2/src/m.v", "second\n");
+    dir.File("r3/src/m.v", "third\n");
     const std::string roots = (dir / "none") + ":" + (dir / "r0") + ":" + (dir / "r1") + ":" +
                               (dir / "r2") + ":" + (dir / "r3");
-    EnvSetting v("VORNIX", roots.c_str());
+    ScopedEnv v("VORNIX", roots.c_str());
 
     EXPECT_EQ(Port::VornixPath::FindDirectory("src/lib"), dir / "r2/src/lib");
     EXPECT_EQ(Port::VornixPath::FindDirectory("src/missing"), "");
@@ -180,14 +179,12 @@ TEST(PortFile, DataThatNeverEndsIsRefused) {
 
 TEST(PortEnv, DataFileFromTheFirstRootHoldingIt) {
     TempDir dir;
-    MakeDirs(dir / "r1/data");
-    MakeDirs(dir / "r2/data");
-    MakeDirs(dir / "r2/data/dirname");
-    WriteFile(dir / "r1/data/only1.acd", "x");
-    WriteFile(dir / "r2/data/both.pfd", "2");
-    WriteFile(dir / "r1/data/both.pfd", "1");
-    WriteFile(dir / "r2/data/only2.key", "x");
-    EnvSetting v("VORNIX", (dir / "none:" + dir.path() + "/r1:" + dir.path() + "/r2").c_str());
+    dir.Dir("r2/data/dirname");
+    dir.File("r1/data/only1.acd", "x");
+    dir.File("r2/data/both.pfd", "2");
+    dir.File("r1/data/both.pfd", "1");
+    dir.File("r2/data/only2.key", "x");
+    ScopedEnv v("VORNIX", (dir / "none:" + dir.Path() + "/r1:" + dir.Path() + "/r2").c_str());
     EXPECT_EQ(std::string(Port_Env::GetDataFileName("both.pfd", 1)), dir / "r1/data/both.pfd");
     EXPECT_EQ(std::string(Port_Env::GetDataFileName("only2.key", 0)), dir / "r2/data/only2.key");
     EXPECT_EQ(Port_Env::GetDataFileName("missing", 1), nullptr);
@@ -222,10 +219,10 @@ TEST(PmPic, SplitsThePartName) {
 class PmDevkey : public ::testing::Test {
 protected:
     void SetUp() override {
-        MakeDirs(dir_ / "first/data");
-        MakeDirs(dir_ / "second/data");
-        root_ = std::make_unique<EnvSetting>(
-            "VORNIX", (dir_.path() + "/first:" + dir_.path() + "/second").c_str());
+        dir_.Dir("first/data");
+        dir_.Dir("second/data");
+        root_ = std::make_unique<ScopedEnv>(
+            "VORNIX", (dir_.Path() + "/first:" + dir_.Path() + "/second").c_str());
     }
     std::vector<std::string> Items(const PM_DEVKEY& key, const char* name) {
         std::vector<std::string> out;
@@ -234,7 +231,7 @@ protected:
         return out;
     }
     TempDir dir_;
-    std::unique_ptr<EnvSetting> root_;
+    std::unique_ptr<ScopedEnv> root_;
 };
 
 TEST_F(PmDevkey, ReadsListsUnderKeys) {

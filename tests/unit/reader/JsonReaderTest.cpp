@@ -268,7 +268,7 @@ TEST_F(JsonReaderBadInput, ReportsTheSystemReasonForAnUnreadableFile) {
         std::string path;
         const char* reason;
     } cases[] = {{dir / "missing.json", "No such file or directory"},
-                 {dir.path(), "Is a directory"}};
+                 {dir.Path(), "Is a directory"}};
     for (const Case& c : cases) ExpectOneError(LoadFile(c.path), c.path, {"cannot read", c.reason});
 }
 

@@ -13,10 +13,7 @@
 
 namespace readertest {
 
-using nlwtest::Exists;
-using nlwtest::ReadFile;
-using nlwtest::TempDir;
-using nlwtest::WriteFile;
+using namespace nlwtest;
 
 // An installation root of the test's own, with the data files given (a
 // name and its text each), made the only installation while it lives.
@@ -30,9 +27,9 @@ public:
     explicit Installation(const DataFiles& files = {}) {
         for (const DataFile& f : files) dir_.File("data/" + f.name, f.text);
         dir_.Dir("data");
-        vornix_.Set(dir_.path().c_str());
+        vornix_.Set(dir_.Path().c_str());
     }
-    const std::string& path() const { return dir_.path(); }
+    const std::string& Path() const { return dir_.Path(); }
 
 private:
     TempDir dir_;
