@@ -8,13 +8,11 @@
 namespace {
 
 namespace fs = std::filesystem;
-using vwtest::ScopedEnv;
+using namespace nlwtest;
 
 class VerilogFlow : public ::testing::Test {
 protected:
     void SetUp() override {
-        char pattern[] = "/tmp/nlw_flow_XXXXXX";
-        dir = mkdtemp(pattern);
         output = dir + "/top.v";
         params.SetOutputFileName(output.c_str());
         params.SetOutputFileMode(Port::Stream::Replace);
@@ -33,8 +31,6 @@ protected:
         dashed = builder.AddSignal(top, "c-d");
         Nlw_Nl_SpkCache::Clear();
     }
-    void TearDown() override { fs::remove_all(dir); }
-
     std::vector<std::string> Files() const {
         std::vector<std::string> names;
         for (const fs::directory_entry& e : fs::directory_iterator(dir))
@@ -53,7 +49,8 @@ protected:
     ScopedEnv noCache{"NLW_NO_NAMECACHE", nullptr};
     ScopedEnv noBridge{"VOR_NLW_LU_NO_BRIDGEID", nullptr};
     ScopedEnv noDump{"NLW_WRITE_NLWFILE", nullptr};
-    std::string dir, output;
+    TempDir tmp;
+    std::string dir = tmp.Path(), output;
     Nlw_Verilog nlw;
     Nlw_Params params;
     Nlw_NlView view;
