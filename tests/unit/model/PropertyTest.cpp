@@ -64,21 +64,11 @@ TEST(VdmPropertyHolder, LookupReplaceRemove) {
 
 TEST(NlwUtil, IntAndStringProperties) {
     Vdm_PropertyHolder h;
-    h.AddProperty(Vdm_Property::NewInt("CONN", 2));
-    h.AddProperty(Vdm_Property::NewString("NUM", "-12"));
-    h.AddProperty(Vdm_Property::NewString("PINNAME", "P12"));
-    h.AddProperty(Vdm_Property::NewString("EMPTY", ""));
-    h.AddProperty(Vdm_Property::NewString("HUGE", "99999999999"));
-    h.AddProperty(Vdm_Property::NewString("SPACED", " 5"));
-    h.AddProperty(Vdm_Property::NewFloat("FLOAT", 1.0));
-    struct Case {
-        const char* name;
-        int32_t value;
-    };
-    const Case cases[] = {{"CONN", 2},  {"NUM", -12},   {"PINNAME", 99}, {"EMPTY", 99},
-                          {"HUGE", 99}, {"SPACED", 99}, {"FLOAT", 99},   {"NONE", 99}};
-    for (const Case& c : cases)
-        EXPECT_EQ(Nlw_Util::GetInt32Prop(&h, c.name, 99), c.value) << c.name;
+    const std::vector<nlwtest::Row> cases = nlwtest::Table("int_props");
+    for (const nlwtest::Row& c : cases)
+        if (c[0] != "-") h.AddProperty(nlwtest::NewProperty(c[0], c[1].c_str(), c[2]));
+    for (const nlwtest::Row& c : cases)
+        EXPECT_EQ(Nlw_Util::GetInt32Prop(&h, c[1].c_str(), 99), std::stoi(c[3])) << c[1];
     EXPECT_EQ(Nlw_Util::GetInt32Prop(nullptr, "CONN", 5), 5);
     EXPECT_STREQ(Nlw_Util::GetStringProp(&h, "PINNAME"), "P12");
     EXPECT_EQ(Nlw_Util::GetStringProp(&h, "CONN"), nullptr);
