@@ -139,18 +139,18 @@ TEST_F(JsonReaderHierarchy, ChoosesTheTopModule) {
     }
 }
 
-// A chain of nested modules, each passing one net down to the next; the
-// last holds a flip-flop.
-std::string Chain(int depth) {
+// A chain of nested modules, each passing one net down to the copies of the
+// next (and with tied, an output tied to 0); the last holds a flip-flop.
+std::string Chain(int depth, int copies = 1, bool tied = false) {
+    const std::string z = tied ? ", \"z\": {\"direction\": \"output\", \"bits\": [\"0\"]}" : "";
     std::string j = "{\"modules\": {";
     for (int k = 0; k < depth; ++k) {
         j += "\"m" + std::to_string(k) + "\": {\"ports\": {\"a\": {\"direction\": \"input\", " +
-             "\"bits\": [2]}}, \"cells\": {";
-        if (k + 1 < depth)
-            j += "\"c\": {\"type\": \"m" + std::to_string(k + 1) +
-                 "\", \"connections\": {\"a\": [2]}}";
-        else
-            j += "\"r\": {\"type\": \"FD\", \"connections\": {\"D\": [2]}}";
+             "\"bits\": [2]}" + z + "}, \"cells\": {";
+        for (int c = 0; c < copies && k + 1 < depth; ++c)
+            j += std::string(c ? ", \"" : "\"") + char('c' + c) + "\": {\"type\": \"m" +
+                 std::to_string(k + 1) + "\", \"connections\": {\"a\": [2]}}";
+        if (k + 1 == depth) j += "\"r\": {\"type\": \"FD\", \"connections\": {\"D\": [2]}}";
         j += "}, \"netnames\": {}},";
     }
     j.back() = '}';
@@ -173,6 +173,23 @@ TEST_F(JsonReaderHierarchy, UnfoldsAndFlattensVeryDeepNesting) {
     Nlw_NlBlock* r = f.root()->GetChildren()[0];
     EXPECT_EQ(std::string(r->GetInstanceName()).size(), 2u * (flatDepth - 1) + 1);
     EXPECT_EQ(NetOf(r, "D"), "a");
+}
+
+// A hierarchy that multiplies out to more instances than a model can hold
+// is refused before it is built, with its size; the estimate of the memory
+// it needs counts the pins of the module instances too.
+TEST_F(JsonReaderHierarchy, RefusesAHierarchyTooBigToUnfold) {
+    auto gib = [](const Loaded& l) {
+        const size_t at = l.errors.empty() ? std::string::npos : l.errors[0].find("need about ");
+        return at == std::string::npos ? 0.0 : std::stod(l.errors[0].substr(at + 11));
+    };
+    Loaded one = LoadText(Chain(34, 2)), two = LoadText(Chain(34, 2, true));
+    ASSERT_EQ(one.errors.size(), 1u);
+    EXPECT_FALSE(one.ok);
+    EXPECT_NE(one.errors[0].find("the hierarchy unfolds to 2.577e+10 instances"), std::string::npos)
+        << one.errors[0];
+    EXPECT_GT(gib(two), gib(one));  // one more pin on every instance
+    EXPECT_GT(gib(one), 0.0);
 }
 
 // ---------------------------------------------------------------------------
