@@ -351,10 +351,6 @@ protected:
 };
 
 TEST_F(Bus, SplitsBusBitNamesInTheInputStyle) {
-    // Any of [] <> () read, one dimension, by default.
-    EXPECT_EQ(Nlw_NlBus::GetInputDelimiterType(), 7);
-    EXPECT_EQ(Nlw_NlBus::GetOutputDelimiterType(), 4);
-    EXPECT_FALSE(Nlw_NlBus::GetMultiDimensions());
     for (const nlwtest::Row& c : nlwtest::Table("bus_names")) {
         SCOPED_TRACE(::testing::Message() << c[0] << " style " << c[1]);
         Nlw_NlBus::SetInputDelimiterType(std::stoi(c[1]));

@@ -189,7 +189,6 @@ TEST_F(JsonReaderHierarchy, RefusesAHierarchyTooBigToUnfold) {
     EXPECT_NE(one.errors[0].find("the hierarchy unfolds to 2.577e+10 instances"), std::string::npos)
         << one.errors[0];
     EXPECT_GT(gib(two), gib(one));  // one more pin on every instance
-    EXPECT_GT(gib(one), 0.0);
 }
 
 // ---------------------------------------------------------------------------

@@ -17,15 +17,12 @@ using namespace nlwtest;
 
 // An installation root of the test's own, with the data files given (a
 // name and its text each), made the only installation while it lives.
-struct DataFile {
-    std::string name, text;
-};
-using DataFiles = std::vector<DataFile>;
+using DataFiles = std::vector<std::pair<std::string, std::string>>;
 
 class Installation {
 public:
     explicit Installation(const DataFiles& files = {}) {
-        for (const DataFile& f : files) dir_.File("data/" + f.name, f.text);
+        for (const auto& [name, text] : files) dir_.File("data/" + name, text);
         dir_.Dir("data");
         vornix_.Set(dir_.Path().c_str());
     }
