@@ -2,6 +2,7 @@
 // text padding and the simulatable property table.
 #include "framework/Nlw_NetlistWriter.h"
 
+#include <cstring>
 #include <unordered_set>
 
 #ifndef NLW_VERSION
@@ -19,8 +20,10 @@ bool Nlw_ICaseLess::operator()(const Port::String& a, const char* b) const {
 }
 
 const char* Nlw_Property::ParameterName(const char* propertyName) {
-    if (UT_STR::ICompare(propertyName, "INITSTATE") == 0 ||
-        UT_STR::ICompare(propertyName, "INIT_BIT") == 0)
+    // Asked for every parameter of every cell: the length rules out most.
+    const size_t length = propertyName ? std::strlen(propertyName) : 0;
+    if ((length == 9 && UT_STR::ICompare(propertyName, "INITSTATE") == 0) ||
+        (length == 8 && UT_STR::ICompare(propertyName, "INIT_BIT") == 0))
         return "INIT";
     return propertyName;
 }

@@ -57,10 +57,15 @@ int UT_STR::Compare(const char* a, const char* b) {
 int UT_STR::ICompare(const char* a, const char* b) {
     a = UT_STR::OrEmpty(a);
     b = UT_STR::OrEmpty(b);
+    // Names compared so mostly agree byte for byte; case is looked at only
+    // where they do not.
     for (;; ++a, ++b) {
+        if (*a == *b) {
+            if (*a == '\0') return 0;
+            continue;
+        }
         int ca = Lower(*a), cb = Lower(*b);
         if (ca != cb) return ca < cb ? -1 : 1;
-        if (ca == 0) return 0;
     }
 }
 
