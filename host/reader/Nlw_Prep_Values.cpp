@@ -7,6 +7,7 @@
 #include <cstdlib>
 #include <cstring>
 #include <string>
+#include <string_view>
 
 #include "model/Vdm_Property.h"
 #include "port/UT.h"
@@ -18,13 +19,13 @@ bool Is(const char* type, const char* what) {
     return UT_STR::ICompare(type, what) == 0;
 }
 
-bool HasUnknownBits(const std::string& bits) {
+bool HasUnknownBits(std::string_view bits) {
     return bits.find_first_not_of("01") != std::string::npos;
 }
 
 // Hexadecimal digits of a bit text (most significant first), padded with
 // zeros to whole digits; x and z count as 0.
-std::string BitsToHex(const std::string& bits) {
+std::string BitsToHex(std::string_view bits) {
     static const char kDigits[] = "0123456789ABCDEF";
     size_t pad = (4 - bits.size() % 4) % 4;
     std::string hex;
@@ -43,7 +44,7 @@ std::string BitsToHex(const std::string& bits) {
 }
 
 // The value of a bit text as a 32-bit integer: the low 32 bits, x and z as 0.
-int32_t BitsToInt(const std::string& bits) {
+int32_t BitsToInt(std::string_view bits) {
     uint32_t v = 0;
     for (char c : bits) v = (v << 1) | (c == '1' ? 1u : 0u);
     return static_cast<int32_t>(v);
@@ -112,12 +113,13 @@ std::unique_ptr<Vdm_Property> Nlw_Prep::Convert(const Vdm_Property& value, const
     std::unique_ptr<Vdm_Property> out;
     switch (value.GetType()) {
         case VDM_PROP_BITS: {
-            std::string bits = value.GetString();
+            // A bits property always has its text.
+            const std::string_view bits = value.GetString();
             int32_t n = BitsToInt(bits);
             if (Is(type, "HV"))
                 out.reset(Vdm_Property::NewString(name, BitsToHex(bits).c_str()));
             else if (Is(type, "BV"))
-                out.reset(Vdm_Property::NewString(name, bits.c_str()));
+                out.reset(Vdm_Property::NewString(name, value.GetString()));
             else if (Is(type, "I") || Is(type, "S"))
                 out.reset(Vdm_Property::NewInt(name, n));
             else if (Is(type, "F"))
@@ -164,12 +166,14 @@ std::unique_ptr<Vdm_Property> Nlw_Prep::Convert(const Vdm_Property& value, const
 bool Nlw_Prep::VerilogLiteral(const Vdm_Property& value, std::string& out) {
     switch (value.GetType()) {
         case VDM_PROP_BITS: {
-            std::string bits = value.GetString();
+            const std::string_view bits = value.GetString();
             if (bits.empty()) return false;
-            if (bits.size() % 4 == 0 && !HasUnknownBits(bits))
+            if (bits.size() % 4 == 0 && !HasUnknownBits(bits)) {
                 out = std::to_string(bits.size()) + "'h" + BitsToHex(bits);
-            else
-                out = std::to_string(bits.size()) + "'b" + bits;
+            } else {
+                out = std::to_string(bits.size()) + "'b";
+                out.append(bits);
+            }
             return true;
         }
         case VDM_PROP_INT:
