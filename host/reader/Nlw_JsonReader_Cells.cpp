@@ -12,17 +12,37 @@ using simdjson::dom::object;
 
 namespace {
 
-int DirectionOf(object dirs, bool haveDirs, std::string_view pin) {
-    if (!haveDirs) return NLW_DIR_UNTYPED;
-    std::string_view s;
-    // The pin's name as the file may spell it, with yosys's public mark.
-    if (dirs.at_key(pin).get_string().get(s) &&
-        dirs.at_key("\\" + std::string(pin)).get_string().get(s))
-        return NLW_DIR_UNTYPED;
+int DirectionCode(std::string_view s) {
     if (s == "input") return NLW_DIR_INPUT;
     if (s == "output") return NLW_DIR_OUTPUT;
     if (s == "inout") return NLW_DIR_INOUT;
     return NLW_DIR_UNTYPED;
+}
+
+// A cell's kept "port_directions" (none: no entries).
+struct Dirs {
+    const DirEntry* first = nullptr;
+    uint32_t count = 0;
+    bool have = false;
+};
+
+// The direction the cell gives a pin: its entry under the pin's name as the
+// file may spell it, plain or with yosys's public mark; the first entry of
+// a name counts, and one that is no string counts as none.
+int DirectionOf(const Dirs& dirs, std::string_view pin) {
+    if (!dirs.have) return NLW_DIR_UNTYPED;
+    auto find = [&](std::string_view key, bool marked) -> const DirEntry* {
+        for (uint32_t i = 0; i < dirs.count; ++i) {
+            std::string_view k = dirs.first[i].key;
+            if (marked ? (k.size() == key.size() + 1 && k[0] == '\\' && k.substr(1) == key)
+                       : k == key)
+                return &dirs.first[i];
+        }
+        return nullptr;
+    };
+    const DirEntry* e = find(pin, false);
+    if (!e || !e->isString) e = find(pin, true);
+    return e && e->isString ? e->dir : NLW_DIR_UNTYPED;
 }
 
 // A pin a connection or a direction names that the type's definition does
@@ -39,29 +59,58 @@ uint32_t AddPin(LibType& lt, std::string_view name, int dir, TextPool& pool) {
     return idx;
 }
 
+[[noreturn]] void NoSuchPin(const Where& where, std::string_view type, std::string_view pin) {
+    Fail(where.Text() + ": cell type '" + std::string(type) + "' has no pin '" + std::string(pin) +
+         "'");
+}
+
+[[noreturn]] void TooWide(const Where& where, uint32_t width, std::string_view pin,
+                          std::string_view type, uint32_t has) {
+    Fail(where.Text() + ": " + std::to_string(width) + " bits, but pin '" + std::string(pin) +
+         "' of cell type '" + std::string(type) + "' has " + std::to_string(has));
+}
+
 // The type's pin of a connection. Instances list their connections in the
 // same order as a rule, mostly the order of the type's pins, so the pin at
 // the connection's position is tried before the index.
 uint32_t LeafSlot(Design& d, LibType& lt, uint32_t position, std::string_view pin, uint32_t width,
-                  object dirs, bool haveDirs, const Where& where) {
+                  const Dirs& dirs, const Where& where) {
     uint32_t idx;
     if (position < lt.pins.size() && pin == lt.pins[position].name) {
         idx = position;
     } else {
         auto it = lt.pinIndex.find(pin);
         // The library and a black box define every pin their cells have.
-        if (it == lt.pinIndex.end() && (lt.def || lt.blackbox >= 0))
-            Fail(where.Text() + ": cell type '" + lt.name + "' has no pin '" + std::string(pin) +
-                 "'");
-        if (it == lt.pinIndex.end())
-            return AddPin(lt, pin, DirectionOf(dirs, haveDirs, pin), d.pool);
+        if (it == lt.pinIndex.end() && (lt.def || lt.blackbox >= 0)) NoSuchPin(where, lt.name, pin);
+        if (it == lt.pinIndex.end()) return AddPin(lt, pin, DirectionOf(dirs, pin), d.pool);
         idx = it->second;
     }
     LibType::Pin& p = lt.pins[idx];
-    if (p.dir == NLW_DIR_UNTYPED) p.dir = DirectionOf(dirs, haveDirs, pin);
-    if (p.fixedRange && width > p.width)
-        Fail(where.Text() + ": " + std::to_string(width) + " bits, but pin '" + std::string(pin) +
-             "' of cell type '" + lt.name + "' has " + std::to_string(p.width));
+    if (p.dir == NLW_DIR_UNTYPED) p.dir = DirectionOf(dirs, pin);
+    if (p.fixedRange && width > p.width) TooWide(where, width, pin, lt.name, p.width);
+    return idx;
+}
+
+// The same for a library cell whose pins all have directions, from the
+// library alone: such a type's pins are the library's, in its order. With
+// a guess, a pin that does not fit is left kUnresolved instead.
+uint32_t LibrarySlot(const Nlw_CellDef& def, uint32_t position, std::string_view pin,
+                     uint32_t width, const Where& where, bool guess) {
+    uint32_t idx = 0;
+    if (position < def.pins.size() && pin == def.pins[position].name) {
+        idx = position;
+    } else {
+        while (idx < def.pins.size() && pin != def.pins[idx].name) ++idx;
+        if (idx == def.pins.size()) {
+            if (guess) return kUnresolved;
+            NoSuchPin(where, def.name, pin);
+        }
+    }
+    const uint32_t has = static_cast<uint32_t>(def.pins[idx].Width());
+    if (width > has) {
+        if (guess) return kUnresolved;
+        TooWide(where, width, pin, def.name, has);
+    }
     return idx;
 }
 
@@ -110,37 +159,74 @@ void ReadCellAttrs(object attrs, TextPool& pool, CellExtra& x, std::string_view&
     }
 }
 
+// How the connections of cells of one type are matched while the module is
+// read. Runs of cells of one type are common, so the last answer is kept.
+struct TypeTexts {
+    std::string_view file;  // the type as the file gives it
+    Text name = "";         // less the public mark, in the pool
+    // The library's definition when each of its pins has a direction: then
+    // pins are matched while reading.
+    const Nlw_CellDef* def = nullptr;
+    // The name names a module too: a black box (whose pins are then the
+    // library's) or not (whose are its ports).
+    bool speculative = false;
+    // Whether cells of the type keep their directions for later.
+    bool keepDirs = false;
+};
+
+void LearnType(const Design& d, std::string_view file, TextPool& pool, bool speculate,
+               TypeTexts& t) {
+    t.file = file;
+    const std::string_view name = PublicName(file);
+    t.name = pool.Keep(name);
+    const Nlw_CellDef* def = d.cellLib.Find(std::string(name));
+    const bool module = d.moduleIndex.count(name) != 0;
+    bool typed = def != nullptr;
+    if (def)
+        for (const Nlw_CellPinDef& p : def->pins) typed = typed && p.dir != NLW_DIR_UNTYPED;
+    t.def = typed && (!module || speculate) ? def : nullptr;
+    t.speculative = module && t.def;
+    // A module's instance has the module's ports, a black box's the
+    // library's pins or its ports (which all have directions).
+    t.keepDirs = def ? !typed : !module;
+}
+
+// The raw name of a cell, for a message.
+std::string_view RawName(const Cell& c, std::string& buffer) {
+    if (!c.marked) return c.name;
+    buffer.assign("\\");
+    buffer += c.name;
+    return buffer;
+}
+
 // The cell's type: a module of the file, or a library type. Runs of cells
 // of one type are common, so the last answer is kept.
 struct TypeCache {
-    std::string last;
+    Text last = nullptr;
     bool macro = false;
     uint32_t type = 0;
 };
 
-void ResolveType(Design& d, std::string_view name, TypeCache& cache, Cell& c) {
-    if (!cache.last.empty() && name == cache.last) {
-        c.macro = cache.macro;
-        c.type = cache.type;
-        return;
+void ResolveType(Design& d, Text name, TypeCache& cache, Cell& c) {
+    if (name != cache.last) {
+        auto mit = d.moduleIndex.find(name);
+        if (mit != d.moduleIndex.end() && !d.modules[mit->second].blackbox) {
+            cache.macro = true;
+            cache.type = mit->second;
+        } else {
+            cache.macro = false;
+            cache.type = FindOrAddLibType(d, name);
+        }
+        cache.last = name;
     }
-    auto mit = d.moduleIndex.find(name);
-    if (mit != d.moduleIndex.end() && !d.modules[mit->second].blackbox) {
-        c.macro = true;
-        c.type = mit->second;
-    } else {
-        c.macro = false;
-        c.type = FindOrAddLibType(d, name);
-    }
-    cache.last.assign(name);
-    cache.macro = c.macro;
-    cache.type = c.type;
+    c.macro = cache.macro;
+    c.type = cache.type;
 }
 
 }  // namespace
 
-void ReadCellTexts(Module& m, object cells, TextPool& pool, NameScratch& scratch,
-                   DigestWork& work) {
+void ReadCellTexts(const Design& d, Module& m, object cells, TextPool& pool, NameScratch& scratch,
+                   bool speculate) {
     Where where{m.name, {}, {}, {}};
     Nlw_NameTable& cellNames = scratch.cellNames;
     // Room for a typical cell's connections and parameters; what is left
@@ -151,8 +237,8 @@ void ReadCellTexts(Module& m, object cells, TextPool& pool, NameScratch& scratch
     m.conns.reserve(m.conns.size() + 4 * n);
     m.refs.reserve(m.refs.size() + 4 * n);
     m.params.reserve(m.params.size() + n);
-    work.cells.reserve(n);
-    work.connKeys.reserve(4 * n);
+    TypeTexts type;
+    bool haveType = false;
     for (auto kv : cells) {
         where.cell = kv.key;
         where.section = {};
@@ -161,15 +247,14 @@ void ReadCellTexts(Module& m, object cells, TextPool& pool, NameScratch& scratch
         if (kv.value.get_object().get(co)) Fail(where.Text() + ": expected an object");
         // One walk over the cell's members; the connections wait for the
         // type and the directions.
-        CellTexts t;
-        t.key = kv.key;
-        bool haveType = false, haveConns = false;
-        object params, attrs, conns;
+        std::string_view typeName;
+        bool typed = false, haveDirs = false, haveConns = false;
+        object params, attrs, dirs, conns;
         bool haveParams = false, haveAttrs = false;
         for (auto f : co) {
             std::string_view k = f.key;
             if (k == "type") {
-                haveType = !f.value.get_string().get(t.typeName);
+                typed = !f.value.get_string().get(typeName);
             } else if (k == "parameters") {
                 params = ObjectOf(f.value, where, "parameters");
                 haveParams = true;
@@ -177,27 +262,44 @@ void ReadCellTexts(Module& m, object cells, TextPool& pool, NameScratch& scratch
                 attrs = ObjectOf(f.value, where, "attributes");
                 haveAttrs = true;
             } else if (k == "port_directions") {
-                t.dirs = ObjectOf(f.value, where, "port_directions");
-                t.haveDirs = true;
+                dirs = ObjectOf(f.value, where, "port_directions");
+                haveDirs = true;
             } else if (k == "connections") {
                 conns = ObjectOf(f.value, where, "connections");
                 haveConns = true;
             }
         }
-        if (!haveType) Fail(where.Text() + ": missing or bad \"type\"");
-        Cell& c = m.cells.emplace_back();
-        c.name = pool.Keep(PublicName(kv.key));
-        if (!cellNames.Insert(c.name, nullptr).second) {
-            m.cells.pop_back();
-            Fail(where.Text() + ": given twice");
-        }
+        if (!typed) Fail(where.Text() + ": missing or bad \"type\"");
+        Text name = pool.Keep(PublicName(kv.key));
+        if (!cellNames.Insert(name, nullptr).second) Fail(where.Text() + ": given twice");
+        if (!haveType || typeName != type.file) LearnType(d, typeName, pool, speculate, type);
+        haveType = true;
         // From here on, a fault of the cell comes after those its type and
-        // connections have: the cell is resolved up to the fault.
-        work.cells.push_back(t);
-        CellTexts& kept = work.cells.back();
-
+        // its connections so far have: the cell is resolved up to the fault.
+        const uint32_t self = static_cast<uint32_t>(m.cells.size());
+        Cell& c = m.cells.emplace_back();
+        c.name = name;
+        c.marked = PublicName(kv.key).size() != kv.key.size();
+        c.typeName = type.name;
+        c.speculative = type.speculative;
         c.paramFirst = static_cast<uint32_t>(m.params.size());
         c.connFirst = static_cast<uint32_t>(m.conns.size());
+        if (haveDirs && type.keepDirs) {
+            CellDirs cd;
+            cd.cell = self;
+            cd.first = static_cast<uint32_t>(m.dirEntries.size());
+            for (auto dv : dirs) {
+                DirEntry e;
+                e.key = pool.Keep(dv.key);
+                std::string_view s;
+                e.isString = !dv.value.get_string().get(s);
+                e.dir = e.isString ? DirectionCode(s) : NLW_DIR_UNTYPED;
+                m.dirEntries.push_back(e);
+            }
+            cd.count = static_cast<uint32_t>(m.dirEntries.size()) - cd.first;
+            m.cellDirs.push_back(cd);
+        }
+
         if (haveParams) {
             where.section = "parameter";
             for (auto pv : params) {
@@ -219,68 +321,108 @@ void ReadCellTexts(Module& m, object cells, TextPool& pool, NameScratch& scratch
         }
         if (haveAttrs && attrs.size() > 0) {
             CellExtra x;
-            ReadCellAttrs(attrs, pool, x, kept.loc, where);
+            std::string_view loc;
+            ReadCellAttrs(attrs, pool, x, loc, where);
             if (*x.aka || *x.pinName || *x.typeAttr) {
                 c.extra = static_cast<uint32_t>(m.extras.size());
                 m.extras.push_back(x);
             }
+            if (!loc.empty()) m.locs.emplace_back(self, std::string(loc));
         }
         if (haveConns) {
             where.section = "connection";
+            uint32_t position = 0;
             for (auto cv : conns) {
                 where.key = cv.key;
                 Conn cn;
                 cn.bitFirst = static_cast<uint32_t>(m.refs.size());
                 cn.width = ReadBits(cv.value, m, where);
+                cn.slot = type.def ? LibrarySlot(*type.def, position, PublicName(cv.key), cn.width,
+                                                 where, type.speculative)
+                                   : kUnresolved;
+                if (cn.slot == kUnresolved)
+                    m.pinKeys.emplace_back(static_cast<uint32_t>(m.conns.size()),
+                                           pool.Keep(cv.key));
                 m.conns.push_back(cn);
-                work.connKeys.push_back(cv.key);
                 ++c.connCount;
+                ++position;
             }
         }
     }
 }
 
-void ResolveCells(Design& d, Module& m, DigestWork& work) {
+bool ResolveCells(Design& d, Module& m) {
+    // A cell read as a library cell whose type is a module after all.
+    Text last = nullptr;
+    bool macro = false;
+    for (const Cell& c : m.cells) {
+        if (!c.speculative) continue;
+        if (c.typeName != last) {
+            last = c.typeName;
+            auto it = d.moduleIndex.find(c.typeName);
+            macro = it != d.moduleIndex.end() && !d.modules[it->second].blackbox;
+        }
+        if (macro) return false;
+    }
     Where where{m.name, {}, "connection", {}};
     TypeCache cache;
-    for (size_t i = 0; i < work.cells.size(); ++i) {
+    std::string rawName;
+    size_t nextKey = 0, nextDirs = 0, nextLoc = 0;
+    for (uint32_t i = 0; i < m.cells.size(); ++i) {
         Cell& c = m.cells[i];
-        const CellTexts& t = work.cells[i];
-        where.cell = t.key;
-        ResolveType(d, PublicName(t.typeName), cache, c);
+        where.cell = RawName(c, rawName);
+        ResolveType(d, c.typeName, cache, c);
         // A leaf's type is its library type until its layout is known.
         const uint32_t base = c.type;
         const bool pad = !c.macro && d.types[base].pad;
+        Dirs dirs;
+        if (nextDirs < m.cellDirs.size() && m.cellDirs[nextDirs].cell == i) {
+            const CellDirs& cd = m.cellDirs[nextDirs++];
+            dirs.first = m.dirEntries.data() + cd.first;
+            dirs.count = cd.count;
+            dirs.have = true;
+        }
         for (uint32_t k = 0; k < c.connCount; ++k) {
             Conn& cn = m.conns[c.connFirst + k];
-            where.key = work.connKeys[c.connFirst + k];
+            if (cn.slot != kUnresolved) continue;
+            where.key = m.pinKeys[nextKey++].second;
             const std::string_view pin = PublicName(where.key);
-            cn.slot = c.macro
-                          ? MacroSlot(d.modules[c.type], k, pin, cn.width, where)
-                          : LeafSlot(d, d.types[base], k, pin, cn.width, t.dirs, t.haveDirs, where);
+            cn.slot = c.macro ? MacroSlot(d.modules[c.type], k, pin, cn.width, where)
+                              : LeafSlot(d, d.types[base], k, pin, cn.width, dirs, where);
         }
-        if (c.macro) continue;
-        // A type the library does not define also takes the pins its
-        // instances declare without connecting them.
-        LibType& lt = d.types[base];
-        if (t.haveDirs && !lt.def && lt.blackbox < 0 && t.dirs.size() != c.connCount) {
-            for (auto dv : t.dirs)
-                if (!lt.pinIndex.count(PublicName(dv.key)))
-                    AddPin(lt, PublicName(dv.key), DirectionOf(t.dirs, true, dv.key), d.pool);
+        if (!c.macro) {
+            // A type the library does not define also takes the pins its
+            // instances declare without connecting them.
+            LibType& lt = d.types[base];
+            if (dirs.have && !lt.def && lt.blackbox < 0 && dirs.count != c.connCount) {
+                for (uint32_t e = 0; e < dirs.count; ++e) {
+                    const std::string_view key = dirs.first[e].key;
+                    if (!lt.pinIndex.count(PublicName(key)))
+                        AddPin(lt, PublicName(key), DirectionOf(dirs, key), d.pool);
+                }
+            }
+            c.type = FindOrAddVariant(d, base, m, c);
         }
-        c.type = FindOrAddVariant(d, base, m, c);
+        const std::string* loc = nullptr;
+        if (nextLoc < m.locs.size() && m.locs[nextLoc].first == i) loc = &m.locs[nextLoc++].second;
         if (!pad) continue;
         m.ownPads = true;
-        if (!t.loc.empty()) {
+        if (loc) {
             if (c.extra == kNone) {
                 c.extra = static_cast<uint32_t>(m.extras.size());
                 m.extras.emplace_back();
             }
             CellExtra& x = m.extras[c.extra];
-            if (!*x.pinName) x.pinName = d.pool.Keep(t.loc);
+            if (!*x.pinName) x.pinName = d.pool.Keep(*loc);
         }
     }
-    if (work.fault) std::rethrow_exception(work.fault);
+    if (m.digestFault) std::rethrow_exception(m.digestFault);
+    // What the resolution needed is done with.
+    std::vector<std::pair<uint32_t, Text>>().swap(m.pinKeys);
+    std::vector<DirEntry>().swap(m.dirEntries);
+    std::vector<CellDirs>().swap(m.cellDirs);
+    std::vector<std::pair<uint32_t, std::string>>().swap(m.locs);
+    return true;
 }
 
 }  // namespace nlw_json

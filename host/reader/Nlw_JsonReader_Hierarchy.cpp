@@ -84,14 +84,41 @@ uint32_t ChooseTop(const Design& d) {
     Fail("several top module candidates: " + NameList(d, unused, ", ") + "; name the top module");
 }
 
+// A module read on the guess that a library cell's name names no module
+// of its own is read again when it does.
+void Reread(Design& d, Module& m, uint32_t self) {
+    Module fresh;
+    fresh.name = m.name;
+    fresh.nameText = m.nameText;
+    fresh.textBegin = m.textBegin;
+    fresh.textEnd = m.textEnd;
+    fresh.reachable = m.reachable;
+    m = std::move(fresh);
+    simdjson::dom::parser parser;
+    simdjson::dom::element root;
+    const simdjson::error_code error =
+        parser
+            .parse(reinterpret_cast<const uint8_t*>(d.text + m.textBegin), m.textEnd - m.textBegin,
+                   false)
+            .get(root);
+    // The text parsed before.
+    if (error == simdjson::MEMALLOC) throw std::bad_alloc();
+    if (error || root.get_object().get(m.json)) FailParse(d, error);
+    NameScratch scratch;
+    scratch.stamp.assign(d.modules.size(), 0);
+    ReadModule(d, m, self, d.pool, scratch, false);
+    if (m.listFault) std::rethrow_exception(m.listFault);
+    DropBlackboxChildren(d, m);
+}
+
+}  // namespace
+
 void LoadCellLibrary(Design& d) {
     const char* path = Port_Env::GetDataFileName("cells.dat", 0);
     if (!path) return;
     std::string error;
-    if (!d.cellLib.Load(path, error)) Fail("cannot use the cell library: " + error);
+    if (!d.cellLib.Load(path, error)) d.cellLibError = "cannot use the cell library: " + error;
 }
-
-}  // namespace
 
 void ResolveHierarchy(Design& d) {
     std::vector<uint32_t> postOrder;
@@ -112,22 +139,15 @@ void ResolveHierarchy(Design& d) {
     for (uint32_t m : postOrder)
         if (d.modules[m].reachable) d.bottomUp.push_back(m);
 
-    LoadCellLibrary(d);
+    if (!d.cellLibError.empty()) Fail(d.cellLibError);
     // Types are met in file order of modules and cells.
-    std::vector<uint32_t> reached;
-    for (uint32_t i = 0; i < d.modules.size(); ++i)
-        if (d.modules[i].reachable) reached.push_back(i);
-    // Both threads parse and digest the texts of every other module; the
-    // cells are resolved here, in order, while the module's document is
-    // open.
-    DigestWork work[ParseAhead::kSlots];
-    ParseAhead ahead(d, reached, [&](size_t k, int thread) {
-        DigestModuleTexts(d.modules[reached[k]], thread ? d.threadPool : d.pool,
-                          thread ? d.threadScratch : d.scratch, work[k % ParseAhead::kSlots]);
-    });
-    for (size_t k = 0; k < reached.size(); ++k) {
-        ahead.Open(k);
-        ResolveCells(d, d.modules[reached[k]], work[k % ParseAhead::kSlots]);
+    for (uint32_t i = 0; i < d.modules.size(); ++i) {
+        Module& m = d.modules[i];
+        if (!m.reachable) continue;
+        if (!ResolveCells(d, m)) {
+            Reread(d, m, i);
+            ResolveCells(d, m);
+        }
     }
     for (uint32_t mi : d.bottomUp) {
         Module& m = d.modules[mi];

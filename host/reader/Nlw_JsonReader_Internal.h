@@ -95,7 +95,9 @@ struct Port {
 };
 
 // One connection of a cell: the pin (library type pin or module port) and
-// its bits in Module::refs.
+// its bits in Module::refs. The pin is kUnresolved until the cell's type is
+// known (see ResolveCells).
+constexpr uint32_t kUnresolved = 0xFFFFFFFFu;
 struct Conn {
     uint32_t slot = 0;
     uint32_t bitFirst = 0;
@@ -111,11 +113,14 @@ struct CellExtra {
 
 struct Cell {
     Text name = "";
-    uint32_t type = 0;  // LibVariant, or module when macro
+    Text typeName = "";  // as the file names it, less yosys's public mark
+    uint32_t type = 0;   // LibVariant, or module when macro
     uint32_t connFirst = 0, connCount = 0;
     uint32_t paramFirst = 0, paramCount = 0;
     uint32_t extra = kNone;  // in Module::extras
     bool macro = false;
+    bool marked = false;       // the file gives the name with the public mark
+    bool speculative = false;  // pins matched to the library's while the type may be a module
 };
 
 // A bus of named nets (a multi-bit port or net name that names some nets).
@@ -158,6 +163,18 @@ struct GlobalNet {
     int32_t floatVal = 0;
 };
 
+// A cell's "port_directions" entry, kept for a cell whose type may gain
+// pins or pin directions from its instances.
+struct DirEntry {
+    Text key = "";  // as the file gives it
+    int dir = NLW_DIR_UNTYPED;
+    bool isString = false;
+};
+struct CellDirs {
+    uint32_t cell = 0;
+    uint32_t first = 0, count = 0;  // in Module::dirEntries
+};
+
 struct Module {
     std::string_view name;  // nameText
     Text nameText = "";
@@ -189,6 +206,18 @@ struct Module {
     // Some pad cell at or below this module needs its port's pin name.
     bool padsBelow = false;
     bool ownPads = false;
+
+    // Left by the reading of the module for the resolution of its cells
+    // (ResolveCells), in cell and connection order: the pins not resolved
+    // yet, by connection; the directions of the cells that may need them;
+    // the "LOC" attributes, which name a package pin only on a pad.
+    std::vector<std::pair<uint32_t, Text>> pinKeys;
+    std::vector<DirEntry> dirEntries;
+    std::vector<CellDirs> cellDirs;
+    std::vector<std::pair<uint32_t, std::string>> locs;
+    // The first fault of the module's attributes, ports and children, and
+    // the first of the rest of its content, raised in file order.
+    std::exception_ptr listFault, digestFault;
 
     const CellExtra& ExtraOf(const Cell& c) const {
         static const CellExtra none;
@@ -270,30 +299,15 @@ struct NameCandidate {
 struct NameScratch {
     // Each module's cell names, checked for repeats; the table is kept.
     Nlw_NameTable cellNames;
+    // Children of the module being read, by module: stamp[child] is the
+    // reading module's number + 1 once listed.
+    std::vector<uint32_t> stamp;
     std::vector<NetEntry> entries;
     std::vector<NameCandidate> cands;
     std::vector<Text> portAka;
     std::vector<uint8_t> portFlags;
     std::vector<uint32_t> rank, winBit;
     std::vector<int32_t> winner, busOf, bitMap;
-};
-
-// What the digest of a module's texts leaves for the resolution of its
-// cells (see DigestModuleTexts): per cell, the texts that name its type and
-// pins, pointing into the module's parsed document.
-struct CellTexts {
-    std::string_view key;       // the cell's name as the file gives it
-    std::string_view typeName;  // with yosys's public mark
-    simdjson::dom::object dirs;
-    bool haveDirs = false;
-    std::string_view loc;  // "LOC": the package pin, should the cell be a pad
-};
-struct DigestWork {
-    std::vector<CellTexts> cells;            // per cell of Module::cells
-    std::vector<std::string_view> connKeys;  // per connection of Module::conns
-    // The first fault of the texts, to be raised once the cells before it
-    // are resolved (their faults come first).
-    std::exception_ptr fault;
 };
 
 struct Design {
@@ -305,7 +319,7 @@ struct Design {
     bool exactSplit = false;
     simdjson::dom::parser parser;
     TextPool pool;
-    // Texts kept by the second thread of the digest (ResolveHierarchy).
+    // Texts kept by the second thread that reads modules.
     TextPool threadPool;
     std::vector<Module> modules;
     std::unordered_map<std::string_view, uint32_t> moduleIndex;
@@ -314,6 +328,9 @@ struct Design {
     std::unordered_map<std::string_view, uint32_t> typeIndex;
     std::vector<uint32_t> signature;  // work space
     Nlw_CellLibrary cellLib;
+    // Why the cell library could not be used: reported after the faults of
+    // the hierarchy, though the library is read before the modules.
+    std::string cellLibError;
     uint32_t top = 0;
     // Modules reachable from the top, each after every module it instantiates.
     std::vector<uint32_t> bottomUp;
@@ -389,19 +406,32 @@ void ParseWhole(Design& d);
 // Reading the document (Nlw_JsonReader_Modules.cpp, Nlw_JsonReader_Cells.cpp).
 // The module list with every module's attributes, ports and children.
 void ReadModuleList(Design& d);
-// A module reached from the top, opened already, is digested in two steps.
-// The first reads its named nets and cells into its tables and names its
-// nets: it touches nothing but the module, the pool and the scratch given,
-// so modules may be digested so in parallel; a fault is kept in the work.
-// The second, in file order, resolves the cells' types and connects their
-// pins (library types are numbered, and grow pins, in the order they are
-// met); the document must still be open.
-void DigestModuleTexts(Module& m, TextPool& pool, NameScratch& scratch, DigestWork& work);
-void ResolveCells(Design& d, Module& m, DigestWork& work);
-void ReadCellTexts(Module& m, simdjson::dom::object cells, TextPool& pool, NameScratch& scratch,
-                   DigestWork& work);
-// Appends the bits of a bit array to m.refs (raw bit numbers, to be mapped
-// to local nets) and returns how many there were.
+// Reads a module just parsed: its attributes, ports and children, then its
+// named nets and cells into its tables, and names its nets. It touches
+// nothing but the module, the pool and the scratch given, and reads the
+// module list and the cell library, so modules are read so on two threads.
+// Faults are kept in the module (listFault, digestFault). A connection to a
+// library cell is matched to its pin here; one whose pin depends on other
+// modules is left kUnresolved.
+//
+// A library cell's name may also name a module of the file, whose black box
+// attribute is known only when every module is read; with speculate, its
+// connections are matched to the library's pins all the same (Cell::
+// speculative), and ResolveCells asks for the module to be read again
+// without when the module turns out to be no black box.
+void ReadModule(const Design& d, Module& m, uint32_t self, TextPool& pool, NameScratch& scratch,
+                bool speculate = true);
+void ReadCellTexts(const Design& d, Module& m, simdjson::dom::object cells, TextPool& pool,
+                   NameScratch& scratch, bool speculate);
+// Drops the black boxes from the module's children, once every module's
+// attributes are read.
+void DropBlackboxChildren(const Design& d, Module& m);
+// Resolves, in file order, the types of a module's cells (library types are
+// numbered, and a type the library does not define gains pins, in the
+// order they are met) and their connections left kUnresolved; raises the
+// module's digest fault once the cells before it are resolved. False, with
+// nothing done, when the module must be read again (see ReadModule).
+bool ResolveCells(Design& d, Module& m);
 uint32_t ReadBits(simdjson::dom::element e, Module& m, const Where& where);
 Value ReadValue(simdjson::dom::element e, TextPool& pool, const Where& where);
 // A value as text: strings as they stand, bits and numbers in decimal.
@@ -417,8 +447,11 @@ Text JoinPath(std::string_view hdlname, TextPool& pool);
 void NameNets(Module& m, NameScratch& s, TextPool& pool);
 
 // Hierarchy (Nlw_JsonReader_Hierarchy.cpp): cycles, top, reachable order,
-// and the digest of every module the top reaches.
+// and the cells of every module the top reaches resolved.
 void ResolveHierarchy(Design& d);
+// Reads the installation's cell library before the modules are read; a
+// fault of it is kept in Design::cellLibError.
+void LoadCellLibrary(Design& d);
 
 // Library types (Nlw_JsonReader_Types.cpp).
 uint32_t FindOrAddLibType(Design& d, std::string_view name);

@@ -6,7 +6,6 @@
 #include <cstdio>
 #include <cstdlib>
 #include <limits>
-#include <optional>
 #include <unordered_map>
 
 #include "reader/Nlw_JsonReader_Internal.h"
@@ -134,7 +133,7 @@ Attrs ReadNetAttrs(object o, TextPool& pool, const Where& where) {
     return a;
 }
 
-void ReadPorts(Design& d, Module& m) {
+void ReadPorts(Module& m, TextPool& pool) {
     Where where{m.name, {}, "port", {}};
     object ports;
     if (!OptionalObject(m.json, "ports", where, ports)) return;
@@ -143,7 +142,7 @@ void ReadPorts(Design& d, Module& m) {
         object po = AsObject(kv.value, where, "a port");
         Port p;
         const std::string_view name = PublicName(kv.key);
-        p.name = d.pool.Keep(name);
+        p.name = pool.Keep(name);
         element e;
         if (po.at_key("direction").get(e)) Fail(where.Text() + ": missing \"direction\"");
         p.dir = ReadDirection(e, where);
@@ -178,7 +177,7 @@ void ReadModuleAttrs(Module& m, TextPool& pool) {
 // The modules a module instantiates, each once, in cell order. Whether a
 // child is a black box is known only when every module's attributes are
 // read, so those are dropped later (DropBlackboxChildren).
-void ReadChildren(Design& d, Module& m, uint32_t self, std::vector<uint32_t>& stamp) {
+void ReadChildren(const Design& d, Module& m, uint32_t self, std::vector<uint32_t>& stamp) {
     Where where{m.name, {}, {}, {}};
     object cells;
     if (!OptionalObject(m.json, "cells", where, cells)) return;
@@ -200,13 +199,6 @@ void ReadChildren(Design& d, Module& m, uint32_t self, std::vector<uint32_t>& st
         stamp[it->second] = self + 1;
         m.children.push_back(it->second);
     }
-}
-
-void DropBlackboxChildren(Design& d, Module& m) {
-    auto& ch = m.children;
-    ch.erase(
-        std::remove_if(ch.begin(), ch.end(), [&](uint32_t c) { return d.modules[c].blackbox; }),
-        ch.end());
 }
 
 template <typename T>
@@ -399,32 +391,27 @@ void ReadModuleListOnce(Design& d) {
             Fail("module '" + std::string(d.modules[i].name) + "' is defined twice");
         }
     if (d.modules.empty()) Fail("no modules");
-    // Each module is parsed once here and once more when it is digested;
-    // here, both threads parse.
-    // The first fault of a module's content is reported only when every
-    // module has been parsed, so that a fault of the text comes first.
-    std::vector<uint32_t> stamp(d.modules.size(), 0);
-    std::optional<ReadError> first;
-    ParseAhead ahead(d, all);
-    for (uint32_t i = 0; i < d.modules.size(); ++i) {
-        Module& m = d.modules[i];
-        ahead.Open(i);
-        if (first) continue;
-        try {
-            ReadModuleAttrs(m, d.pool);
-            ReadPorts(d, m);
-            ReadChildren(d, m, i, stamp);
-        } catch (ReadError& e) {
-            first = std::move(e);
-        }
-    }
-    if (first) throw *first;
+    // Each module is parsed once, by either thread, and read by the thread
+    // that parsed it. The first fault of a module's content is reported
+    // only when every module has been parsed, so that a fault of the text
+    // comes first.
+    d.scratch.stamp.assign(d.modules.size(), 0);
+    d.threadScratch.stamp.assign(d.modules.size(), 0);
+    ParseAhead ahead(d, all, [&d](size_t k, int thread) {
+        ReadModule(d, d.modules[k], static_cast<uint32_t>(k), thread ? d.threadPool : d.pool,
+                   thread ? d.threadScratch : d.scratch);
+    });
+    for (size_t k = 0; k < all.size(); ++k) ahead.Open(k);
+    for (const Module& m : d.modules)
+        if (m.listFault) std::rethrow_exception(m.listFault);
     for (Module& m : d.modules) DropBlackboxChildren(d, m);
 }
 
 }  // namespace
 
 void ReadModuleList(Design& d) {
+    // Connections to library cells are matched while the modules are read.
+    LoadCellLibrary(d);
     try {
         ReadModuleListOnce(d);
     } catch (const GuessFailed&) {
@@ -479,15 +466,28 @@ void ReadNetNames(Module& m, TextPool& pool, std::vector<NetEntry>& entries) {
 
 }  // namespace
 
-void DigestModuleTexts(Module& m, TextPool& pool, NameScratch& scratch, DigestWork& work) {
-    work.cells.clear();
-    work.connKeys.clear();
-    work.fault = nullptr;
+void DropBlackboxChildren(const Design& d, Module& m) {
+    auto& ch = m.children;
+    ch.erase(
+        std::remove_if(ch.begin(), ch.end(), [&](uint32_t c) { return d.modules[c].blackbox; }),
+        ch.end());
+}
+
+void ReadModule(const Design& d, Module& m, uint32_t self, TextPool& pool, NameScratch& scratch,
+                bool speculate) {
+    try {
+        ReadModuleAttrs(m, pool);
+        ReadPorts(m, pool);
+        ReadChildren(d, m, self, scratch.stamp);
+    } catch (...) {
+        m.listFault = std::current_exception();
+        return;
+    }
     try {
         ReadNetNames(m, pool, scratch.entries);
         object cells;
         if (OptionalObject(m.json, "cells", Where{m.name, {}, {}, {}}, cells))
-            ReadCellTexts(m, cells, pool, scratch, work);
+            ReadCellTexts(d, m, cells, pool, scratch, speculate);
         NameNets(m, scratch, pool);
         for (GlobalNet& g : m.globals) g.ref = m.refs[static_cast<size_t>(g.ref)];
         // Growth left room at the ends of the tables; the model is built
@@ -497,8 +497,9 @@ void DigestModuleTexts(Module& m, TextPool& pool, NameScratch& scratch, DigestWo
         Trim(m.conns);
         Trim(m.params);
     } catch (...) {
-        // A fault of the text, or no memory: raised in file order.
-        work.fault = std::current_exception();
+        // A fault of the content, or no memory: raised in file order, and
+        // only should the top reach the module.
+        m.digestFault = std::current_exception();
     }
 }
 

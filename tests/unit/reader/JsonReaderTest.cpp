@@ -74,6 +74,15 @@ TEST_F(JsonReaderCells, TakesPinsFromLibraryBlackboxAndConnections) {
     nlwtest::ExpectGolden("reader/cell_types", Text(l));
 }
 
+// A module of the file that takes a library cell's name is that module
+// (its ports, not the library's pins), one defined later in the file too; a
+// black box of a library cell's name has the library's pins.
+TEST_F(JsonReaderCells, ModulesNamedLikeLibraryCells) {
+    Loaded l = LoadText(nlwtest::Data("json/library_named_modules.json"));
+    ASSERT_TRUE(l.ok) << l.errors[0];
+    nlwtest::ExpectGolden("reader/library_named_modules", Text(l));
+}
+
 TEST_F(JsonReaderCells, RefusesAConnectionWiderThanTheLibraryPin) {
     Loaded l = LoadText(R"({"modules": {"t": {"ports": {},
         "cells": { "g": { "type": "LUT2", "connections": { "I0": [ 2, 3 ] } } },
