@@ -267,10 +267,12 @@ int RunProgram(Nlw_Program program, int argc, const char* const* argv) {
 
 int Nlw_RunProgram(Nlw_Program program, int argc, const char* const* argv) {
 #if defined(__GLIBC__) && defined(M_ARENA_MAX)
-    // One heap for every thread of the run: the threads that parse, prepare
-    // and write beside the main one would each take fresh memory for a heap
-    // of their own while the memory the main one freed stays unused.
-    mallopt(M_ARENA_MAX, 1);
+    // Two heaps, as a run uses two threads at a time: the threads that read
+    // modules would otherwise wait on each other for every table they
+    // allocate. More heaps would each take fresh memory of their own while
+    // the memory the main one freed stays unused. The limit counts only
+    // before the first thread is made.
+    mallopt(M_ARENA_MAX, 2);
 #endif
     // Memory runs out on a design too large for the machine: said as such,
     // and no file of the run is left behind (the open run removes its
