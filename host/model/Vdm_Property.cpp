@@ -5,6 +5,11 @@
 
 Vdm_Property::Vdm_Property(const char* name, int type) : name_(name ? name : ""), type_(type) {}
 
+const std::vector<std::string>& Vdm_Property::GetValueTexts() const {
+    static const std::vector<std::string> none;
+    return values_ ? *values_ : none;
+}
+
 Vdm_Property::~Vdm_Property() {
     ClearElements();
 }
@@ -51,7 +56,7 @@ Vdm_Property* Vdm_Property::NewBits(const char* name, const char* bits) {
 
 Vdm_Property* Vdm_Property::NewTypeDef(const char* name, const std::vector<std::string>& values) {
     auto* p = new Vdm_Property(name, VDM_PROP_TYPEDEF);
-    p->values_ = values;
+    p->values_ = std::make_unique<std::vector<std::string>>(values);
     return p;
 }
 

@@ -2,6 +2,7 @@
 #pragma once
 
 #include <cstdint>
+#include <memory>
 #include <string>
 #include <vector>
 
@@ -52,7 +53,7 @@ public:
     void SetString(const char* text) { text_ = text ? text : ""; }
 
     // Value texts of a type-library definition (code 10).
-    const std::vector<std::string>& GetValueTexts() const { return values_; }
+    const std::vector<std::string>& GetValueTexts() const;
 
     // List elements (code 11).
     size_t GetCount() const { return elems_.size(); }
@@ -66,13 +67,15 @@ public:
     Vdm_Property* CreatePropertyString(const char* name, const char* text);
 
 private:
+    // A design holds a few of these per cell: the members are ordered so
+    // that none pads, and what only a type definition has is kept apart.
     std::string name_;
+    std::string text_;
+    std::vector<Vdm_Property*> elems_;
+    std::unique_ptr<std::vector<std::string>> values_;
+    double d_ = 0;
     int type_;
     int32_t i_ = 0;
-    double d_ = 0;
-    std::string text_;
-    std::vector<std::string> values_;
-    std::vector<Vdm_Property*> elems_;
     bool ownsElements_ = true;
 };
 
