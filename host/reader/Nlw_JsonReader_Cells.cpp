@@ -230,7 +230,7 @@ void ReadCellTexts(const Design& d, Module& m, object cells, TextPool& pool, Nam
     Where where{m.name, {}, {}, {}};
     Nlw_NameTable& cellNames = scratch.cellNames;
     // Room for a typical cell's connections and parameters; what is left
-    // over is given back when the module is digested.
+    // over is given back once the module is read.
     const size_t n = cells.size();
     cellNames.Reset(n);
     m.cells.reserve(m.cells.size() + n);

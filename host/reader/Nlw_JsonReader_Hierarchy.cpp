@@ -1,5 +1,5 @@
-// The module hierarchy: instantiation cycles, the top module, and the
-// modules the top reaches, digested bottom-up.
+// The module hierarchy: instantiation cycles, the top module, the modules
+// the top reaches (listed bottom-up) and the resolution of their cells.
 #include <string>
 
 #include "port/Port.h"

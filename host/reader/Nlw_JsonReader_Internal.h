@@ -344,9 +344,10 @@ struct Design {
 
 // Finding and parsing the modules (Nlw_JsonReader_Split.cpp). SplitModules
 // lists the modules of the text with their names and places; ParseAhead
-// (below) parses them into m.json. Unless Design::exactSplit, the places are judged by the
-// layout, and any fault met shows as GuessFailed, from either, before any
-// module is digested; the list is then made again, exactly.
+// (below) parses them into m.json. Unless Design::exactSplit, the places are
+// judged by the layout, and any fault met shows as GuessFailed, from either,
+// before the module list is done with; the list is then made again,
+// exactly, and the modules read again.
 struct GuessFailed {};
 void SplitModules(Design& d);
 // The fault of a module's text: while the places are judged by the layout,
