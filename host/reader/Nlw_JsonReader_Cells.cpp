@@ -159,26 +159,15 @@ void ReadCellAttrs(object attrs, TextPool& pool, CellExtra& x, std::string_view&
     }
 }
 
-// How the connections of cells of one type are matched while the module is
-// read. Runs of cells of one type are common, so the last answer is kept.
-struct TypeTexts {
-    std::string_view file;  // the type as the file gives it
-    Text name = "";         // less the public mark, in the pool
-    // The library's definition when each of its pins has a direction: then
-    // pins are matched while reading.
-    const Nlw_CellDef* def = nullptr;
-    // The name names a module too: a black box (whose pins are then the
-    // library's) or not (whose are its ports).
-    bool speculative = false;
-    // Whether cells of the type keep their directions for later.
-    bool keepDirs = false;
-};
-
-void LearnType(const Design& d, std::string_view file, TextPool& pool, bool speculate,
-               TypeTexts& t) {
-    t.file = file;
+// The scratch's entry for a cell type, made on first meeting it.
+const CellType& LearnType(const Design& d, std::string_view file, TextPool& pool, bool speculate,
+                          NameScratch& scratch) {
+    if (const Nlw_NameTable::Slot* slot = scratch.typeIndex.Find(file))
+        return *static_cast<const CellType*>(slot->sharer);
+    CellType& t = scratch.types.emplace_back();
     const std::string_view name = PublicName(file);
     t.name = pool.Keep(name);
+    t.file = pool.Keep(file);
     const Nlw_CellDef* def = d.cellLib.Find(std::string(name));
     const bool module = d.moduleIndex.count(name) != 0;
     bool typed = def != nullptr;
@@ -189,6 +178,8 @@ void LearnType(const Design& d, std::string_view file, TextPool& pool, bool spec
     // A module's instance has the module's ports, a black box's the
     // library's pins or its ports (which all have directions).
     t.keepDirs = def ? !typed : !module;
+    scratch.typeIndex.Insert(t.file, &t);
+    return t;
 }
 
 // The raw name of a cell, for a message.
@@ -237,8 +228,7 @@ void ReadCellTexts(const Design& d, Module& m, object cells, TextPool& pool, Nam
     m.conns.reserve(m.conns.size() + 4 * n);
     m.refs.reserve(m.refs.size() + 4 * n);
     m.params.reserve(m.params.size() + n);
-    TypeTexts type;
-    bool haveType = false;
+    const CellType* type = nullptr;
     for (auto kv : cells) {
         where.cell = kv.key;
         where.section = {};
@@ -272,19 +262,19 @@ void ReadCellTexts(const Design& d, Module& m, object cells, TextPool& pool, Nam
         if (!typed) Fail(where.Text() + ": missing or bad \"type\"");
         Text name = pool.Keep(PublicName(kv.key));
         if (!cellNames.Insert(name, nullptr).second) Fail(where.Text() + ": given twice");
-        if (!haveType || typeName != type.file) LearnType(d, typeName, pool, speculate, type);
-        haveType = true;
+        if (!type || typeName != type->file)
+            type = &LearnType(d, typeName, pool, speculate, scratch);
         // From here on, a fault of the cell comes after those its type and
         // its connections so far have: the cell is resolved up to the fault.
         const uint32_t self = static_cast<uint32_t>(m.cells.size());
         Cell& c = m.cells.emplace_back();
         c.name = name;
         c.marked = PublicName(kv.key).size() != kv.key.size();
-        c.typeName = type.name;
-        c.speculative = type.speculative;
+        c.typeName = type->name;
+        c.speculative = type->speculative;
         c.paramFirst = static_cast<uint32_t>(m.params.size());
         c.connFirst = static_cast<uint32_t>(m.conns.size());
-        if (haveDirs && type.keepDirs) {
+        if (haveDirs && type->keepDirs) {
             CellDirs cd;
             cd.cell = self;
             cd.first = static_cast<uint32_t>(m.dirEntries.size());
@@ -337,9 +327,9 @@ void ReadCellTexts(const Design& d, Module& m, object cells, TextPool& pool, Nam
                 Conn cn;
                 cn.bitFirst = static_cast<uint32_t>(m.refs.size());
                 cn.width = ReadBits(cv.value, m, where);
-                cn.slot = type.def ? LibrarySlot(*type.def, position, PublicName(cv.key), cn.width,
-                                                 where, type.speculative)
-                                   : kUnresolved;
+                cn.slot = type->def ? LibrarySlot(*type->def, position, PublicName(cv.key),
+                                                  cn.width, where, type->speculative)
+                                    : kUnresolved;
                 if (cn.slot == kUnresolved)
                     m.pinKeys.emplace_back(static_cast<uint32_t>(m.conns.size()),
                                            pool.Keep(cv.key));

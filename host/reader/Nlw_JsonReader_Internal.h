@@ -11,6 +11,7 @@
 
 #include <condition_variable>
 #include <cstdint>
+#include <deque>
 #include <exception>
 #include <functional>
 #include <map>
@@ -296,9 +297,29 @@ struct NameCandidate {
     uint32_t rank;
     uint8_t flags;
 };
+// How the connections of cells of one type are matched while a module is
+// read (see ReadCellTexts).
+struct CellType {
+    std::string_view file;  // the type as the file gives it, in the pool
+    Text name = "";         // less the public mark, in the pool
+    // The library's definition when each of its pins has a direction: then
+    // pins are matched while reading.
+    const Nlw_CellDef* def = nullptr;
+    // The name names a module too: a black box (whose pins are then the
+    // library's) or not (whose are its ports).
+    bool speculative = false;
+    // Whether cells of the type keep their directions for later.
+    bool keepDirs = false;
+};
+
 struct NameScratch {
     // Each module's cell names, checked for repeats; the table is kept.
     Nlw_NameTable cellNames;
+    // The cell types met so far, by name as the file gives it: a type is
+    // looked up once per reading thread, not at each change of type from
+    // cell to cell. A scratch serves reads of one kind (speculating or not).
+    Nlw_NameTable typeIndex;
+    std::deque<CellType> types;
     // Children of the module being read, by module: stamp[child] is the
     // reading module's number + 1 once listed.
     std::vector<uint32_t> stamp;
