@@ -22,10 +22,6 @@
 
 namespace {
 
-// Below this many instances and pins one thread does it all: the second
-// would cost more than it saves.
-constexpr size_t kTwoThreadsFrom = 50000;
-
 size_t Weight(const Nlw_NlBlock* block) {
     return 1 + block->GetChildren().size() + block->GetPinCount();
 }
@@ -51,14 +47,14 @@ std::vector<std::pair<size_t, size_t>> Runs(const std::vector<Nlw_NlBlock*>& blo
 void Nlw_VerilogWriter::WriteBlocks(Nlw_NlView* view, const std::vector<Nlw_NlBlock*>& blocks) {
     size_t total = 0;
     for (const Nlw_NlBlock* block : blocks) total += Weight(block);
-    const int asked = Nlw_Util::WriteThreadsAsked();
+    const bool forced = Nlw_Util::WriteThreadsAsked() == 2;
     // A class of its own may write blocks its own way; its copy would not.
-    const bool two = typeid(*this) == typeid(Nlw_VerilogWriter) &&
-                     (asked == 2 || (asked == 0 && total >= kTwoThreadsFrom &&
-                                     std::thread::hardware_concurrency() > 1));
-    // Runs of about 1/48 of the whole: the second thread is never far
-    // behind, and what waits in memory is small.
-    const size_t target = asked == 2 ? 1 : std::max(total / 48, kTwoThreadsFrom / 8);
+    const bool two =
+        typeid(*this) == typeid(Nlw_VerilogWriter) && Nlw_Util::WriteOnTwoThreads(total);
+    // Runs of about 1/48 of the whole, and no smaller than an eighth of the
+    // size that takes two threads: the second thread is never far behind,
+    // and what waits in memory is small.
+    const size_t target = forced ? 1 : std::max<size_t>(total / 48, 6250);
     const std::vector<std::pair<size_t, size_t>> runs =
         two ? Runs(blocks, target) : std::vector<std::pair<size_t, size_t>>();
     if (runs.size() < 2) {

@@ -270,18 +270,14 @@ void Nlw_Nl_LU::Process() {
 // view are shared by two threads, the names the second gives kept apart
 // until the view goes.
 void Nlw_Nl_LU::ProcessMacros() {
-    // Below this many instances, pins and nets one thread does it all.
-    constexpr size_t kTwoThreadsFrom = 50000;
     const auto& macros = view_->GetMacros();
     auto weight = [](const Nlw_NlBlock* m) {
         return 1 + m->GetChildren().size() + m->GetPinCount() + m->GetSignals().size();
     };
     size_t total = 0;
     for (const Nlw_NlBlock* m : macros) total += weight(m);
-    const int asked = Nlw_Util::WriteThreadsAsked();
-    const bool two = AnswersOnTwoThreads() && macros.size() > 1 &&
-                     (asked == 2 || (asked == 0 && total >= kTwoThreadsFrom &&
-                                     std::thread::hardware_concurrency() > 1));
+    const bool two =
+        AnswersOnTwoThreads() && macros.size() > 1 && Nlw_Util::WriteOnTwoThreads(total);
     size_t cut = macros.size();
     if (two) {
         // The first half by weight here, the rest on the second thread.

@@ -5,6 +5,7 @@
 #include <cstdlib>
 #include <cstring>
 #include <ctime>
+#include <thread>
 
 #include "framework/Nlw_Nl_LU.h"
 #include "model/Nlw_Nl.h"
@@ -161,4 +162,11 @@ int Nlw_Util::WriteThreadsAsked() {
     const char* asked = Port_Env::GetEnv("NLW_WRITE_THREADS");
     if (asked == nullptr) return 0;
     return std::strcmp(asked, "1") == 0 ? 1 : std::strcmp(asked, "2") == 0 ? 2 : 0;
+}
+
+bool Nlw_Util::WriteOnTwoThreads(size_t work) {
+    constexpr size_t kTwoThreadsFrom = 50000;
+    const int asked = WriteThreadsAsked();
+    return asked == 2 ||
+           (asked == 0 && work >= kTwoThreadsFrom && std::thread::hardware_concurrency() > 1);
 }

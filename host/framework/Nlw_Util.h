@@ -75,4 +75,9 @@ public:
     // one thread, 2 takes two whatever the size of the work; 0 when it asks
     // neither, and the size of the work decides.
     static int WriteThreadsAsked();
+    // Whether writing work of that size (instances, pins, nets) takes two
+    // threads: as NLW_WRITE_THREADS asks, else from 50 000 on a machine of
+    // two cores or more; below that, a second thread costs more than it
+    // saves.
+    static bool WriteOnTwoThreads(size_t work);
 };
