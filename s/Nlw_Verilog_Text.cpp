@@ -2,11 +2,11 @@
 #include <charconv>
 #include <cstring>
 #include <string>
-#include <system_error>
 #include <typeinfo>
 
 #include "Nlw_Verilog.h"
 #include "model/Nlw_Nl.h"
+#include "model/Nlw_NlBuilder.h"
 #include "port/Port.h"
 #include "port/UT.h"
 
@@ -60,21 +60,23 @@ bool IsSimpleIdentifier(const char* name) {
 // writer writes indexes ("data[3]"). Splitting it and joining it again gives
 // the same text, so it stands as it is.
 bool IsPlainBusBit(const char* name) {
-    size_t i = 0;
-    while (Nlw_Verilog::IsSimpleIdentifierChar(static_cast<unsigned char>(name[i]), i == 0)) ++i;
+    const size_t end = std::strlen(name);
     const int type = Nlw_NlBus::GetOutputDelimiterType();
-    if (i == 0 || name[i] != Nlw_NlBus::GetLeftDelimiter(type)) return false;
-    const char* digits = name + i + 1;
-    const char* close = std::strchr(digits, Nlw_NlBus::GetRightDelimiter(type));
-    if (close == nullptr || close[1] != '\0') return false;
+    size_t left = 0;
     int32_t value = 0;
-    const std::from_chars_result read = std::from_chars(digits, close, value);
-    if (read.ec != std::errc() || read.ptr != close) return false;
+    if (!Nlw_NlSplitIndex(name, end, type, left, value) || left == 0 ||
+        name[left] != Nlw_NlBus::GetLeftDelimiter(type) ||
+        name[end - 1] != Nlw_NlBus::GetRightDelimiter(type))
+        return false;
+    for (size_t i = 0; i < left; ++i)
+        if (!Nlw_Verilog::IsSimpleIdentifierChar(static_cast<unsigned char>(name[i]), i == 0))
+            return false;
+    // The index as the writer writes it: no leading zeros.
     char again[16];
     const std::to_chars_result written = std::to_chars(again, again + sizeof again, value);
-    const size_t length = static_cast<size_t>(close - digits);
+    const size_t length = end - left - 2;
     return static_cast<size_t>(written.ptr - again) == length &&
-           std::memcmp(again, digits, length) == 0;
+           std::memcmp(again, name + left + 1, length) == 0;
 }
 
 // Makes buffer "\name " in place, so that earlier results keep reading the
