@@ -375,46 +375,40 @@ void SplitModules(Design& d);
 // GuessFailed; else the message a parse of the whole text gives.
 [[noreturn]] void OpenFailed(Design& d);
 
-// Parses the modules of a list on two threads, ahead of the one being read
-// (Nlw_JsonReader_ParseAhead.cpp).
+// Parses the modules of a list on two threads, each with a parser of its
+// own, ahead of the one being opened (Nlw_JsonReader_ParseAhead.cpp).
 class ParseAhead {
 public:
     // Done with the k-th module of the order as soon as it is parsed, by the
-    // thread that parsed it (0: the caller's, 1: the other). It must not
-    // throw. Module k's document lives until module k + 1 is opened.
+    // thread that parsed it (0: the caller's, 1: the other), while its json
+    // is valid. It must not throw.
     using Work = std::function<void(size_t k, int thread)>;
-    // Modules parsed and not yet let go, at most.
-    static constexpr size_t kSlots = 8;
     // order: the modules to be opened, in the order they will be.
     ParseAhead(Design& d, const std::vector<uint32_t>& order, Work work = nullptr);
     ~ParseAhead();
     ParseAhead(const ParseAhead&) = delete;
     ParseAhead& operator=(const ParseAhead&) = delete;
-    // Opens the k-th module of the order into its json, valid until the
-    // next is opened; the modules before it are let go.
+    // Waits until the k-th module of the order is parsed and worked on
+    // (parsing it, or a later one, itself meanwhile), and raises the fault
+    // of its text if it has one.
     void Open(size_t k);
 
 private:
-    struct Slot {
-        simdjson::dom::parser parser;
-        simdjson::dom::element root;
-        simdjson::error_code error = simdjson::SUCCESS;
-    };
     void Run();
     // Parses module k and does the work with it.
     void Parse(size_t k, int thread);
-    // Whether the next module may be taken: its slot is free.
-    bool Claimable() const;
 
     Design& d_;
     std::vector<uint32_t> order_;
     std::vector<std::pair<size_t, size_t>> ranges_;  // of the text, per module of the order
-    Slot slots_[kSlots];
+    simdjson::dom::parser parsers_[2];               // per thread
     Work work_;
+    // Per module of the order, written before it is marked done.
+    std::vector<simdjson::error_code> errors_;
     // Guarded by mutex_:
-    std::vector<uint8_t> done_;  // per module of the order: parsed
+    enum : uint8_t { kPending, kParsed, kNoObject };
+    std::vector<uint8_t> done_;  // per module of the order
     size_t claimed_ = 0;         // modules of the order taken by either thread
-    size_t released_ = 0;        // modules of the order done with
     bool stop_ = false;
     std::mutex mutex_;
     std::condition_variable changed_;
